@@ -1,0 +1,28 @@
+# Flags that decide floating-point results. Every target whose arithmetic is
+# compared bit for bit (the library, the tests, the benchmarks) links this
+# interface target privately, so a consumer's own flags are never touched.
+#
+# -ffp-contract=off: GCC fuses a*b+c into one rounding by default wherever the
+#   target has FMA; every product and sum here is rounded on its own.
+# -mno-fma: with -march=x86-64-v3 GCC 12 still emits fused vfmaddsub for
+#   complex multiply loops at -O3, even under -ffp-contract=off.
+# No -ffast-math, no -Ofast: reassociation would change the order of sums.
+add_library(kestaccel_fp_flags INTERFACE)
+if(MSVC)
+    target_compile_options(kestaccel_fp_flags INTERFACE /fp:precise)
+else()
+    target_compile_options(kestaccel_fp_flags INTERFACE -ffp-contract=off -fno-fast-math)
+    if(CMAKE_SYSTEM_PROCESSOR MATCHES "^(x86_64|AMD64|amd64|i.86)$")
+        target_compile_options(kestaccel_fp_flags INTERFACE -mno-fma)
+    endif()
+endif()
+if(KESTACCEL_ISA)
+    target_compile_options(kestaccel_fp_flags INTERFACE -march=${KESTACCEL_ISA})
+endif()
+
+# The kernels are written as loops the compiler can vectorise without
+# changing a bit; g++ 12 at -O2 leaves almost all of them scalar.
+set(KESTACCEL_KERNEL_OPT_FLAGS "")
+if(NOT MSVC)
+    set(KESTACCEL_KERNEL_OPT_FLAGS -O3)
+endif()

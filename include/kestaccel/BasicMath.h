@@ -1,0 +1,127 @@
+#pragma once
+
+// Element-wise arithmetic, elementwise functions, reductions, thresholds,
+// channel layout and half precision, over float, double and complex vectors.
+//
+// Every element-wise result is that of the plain scalar loop in ascending
+// index order, also when buffers overlap; each operation is rounded on its
+// own (no fused multiply-add, no reassociation). A count of 0 touches no
+// pointer.
+
+#include <complex>
+
+#include "kestaccel/Common.h"
+
+namespace kestaccel {
+namespace utility {
+
+// ---------------------------------------------------------------------------
+// Real arithmetic, float and double.
+//
+//   Add(n, a, b, dst)              dst[i] = a[i] + b[i]
+//   Add_InPlace(n, src, srcDst)    srcDst[i] = src[i] + srcDst[i]
+//   Sub(n, a, b, dst)              dst[i] = b[i] - a[i]      (second minus first)
+//   Sub_InPlace(n, src, srcDst)    srcDst[i] = srcDst[i] - src[i]
+//   Mul(n, a, b, dst)              dst[i] = a[i] * b[i]
+//   Mul_InPlace(n, src, srcDst)    srcDst[i] = src[i] * srcDst[i]
+//   Div(n, a, b, dst)              dst[i] = b[i] / a[i]      (second over first)
+//   Div_InPlace(n, src, srcDst)    srcDst[i] = srcDst[i] / src[i]
+//   AddConstant                    dst[i] = c + src[i]
+//   SubConstant                    dst[i] = src[i] - c
+//   SubConstantRev                 dst[i] = c - src[i]
+//   MulConstant                    dst[i] = c * src[i]
+//   DivConstant                    dst[i] = src[i] / c
+//   DivConstantRev (float only)    dst[i] = c / src[i]
+//   AddProduct(n, a, b, srcDst)    srcDst[i] = (a[i] * b[i]) + srcDst[i]
+//   AddConstantProduct             srcDst[i] = (src[i] * c) + srcDst[i]
+//
+// Mind the reversed operands of Sub and Div. Division is a true division per
+// element, never a multiplication by a reciprocal. The Div*Constant* forms
+// test the constant once: when it compares equal to zero the call writes
+// nothing at all (for DivConstantRev the constant is the numerator). The
+// vector Div forms follow IEEE arithmetic for zero divisors. AddProduct and
+// AddConstantProduct round the product, then the sum.
+//
+// MulConstant_InPlace on short: the 32-bit product element * constant is
+// wrapped to 16 bits first, then scaled by 2^-scale in double, narrowed to
+// float, and rounded: ties to even for positive values, toward zero for
+// negative ones. The low 16 bits are stored; nothing saturates.
+// ---------------------------------------------------------------------------
+KESTACCEL_API void Add(unsigned int count, const float* a, const float* b, float* dst);
+KESTACCEL_API void Add(unsigned int count, const double* a, const double* b, double* dst);
+KESTACCEL_API void Add_InPlace(unsigned int count, const float* src, float* srcDst);
+KESTACCEL_API void Add_InPlace(unsigned int count, const double* src, double* srcDst);
+KESTACCEL_API void Sub(unsigned int count, const float* a, const float* b, float* dst);
+KESTACCEL_API void Sub(unsigned int count, const double* a, const double* b, double* dst);
+KESTACCEL_API void Sub_InPlace(unsigned int count, const float* src, float* srcDst);
+KESTACCEL_API void Sub_InPlace(unsigned int count, const double* src, double* srcDst);
+KESTACCEL_API void Mul(unsigned int count, const float* a, const float* b, float* dst);
+KESTACCEL_API void Mul(unsigned int count, const double* a, const double* b, double* dst);
+KESTACCEL_API void Mul_InPlace(unsigned int count, const float* src, float* srcDst);
+KESTACCEL_API void Mul_InPlace(unsigned int count, const double* src, double* srcDst);
+KESTACCEL_API void Div(unsigned int count, const float* a, const float* b, float* dst);
+KESTACCEL_API void Div(unsigned int count, const double* a, const double* b, double* dst);
+KESTACCEL_API void Div_InPlace(unsigned int count, const float* src, float* srcDst);
+KESTACCEL_API void Div_InPlace(unsigned int count, const double* src, double* srcDst);
+
+KESTACCEL_API void AddConstant(unsigned int count, const float* src, float constant, float* dst);
+KESTACCEL_API void AddConstant(unsigned int count, const double* src, double constant, double* dst);
+KESTACCEL_API void AddConstant_InPlace(unsigned int count, float* srcDst, float constant);
+KESTACCEL_API void AddConstant_InPlace(unsigned int count, double* srcDst, double constant);
+KESTACCEL_API void SubConstant(unsigned int count, const float* src, float constant, float* dst);
+KESTACCEL_API void SubConstant(unsigned int count, const double* src, double constant, double* dst);
+KESTACCEL_API void SubConstant_InPlace(unsigned int count, float* srcDst, float constant);
+KESTACCEL_API void SubConstant_InPlace(unsigned int count, double* srcDst, double constant);
+KESTACCEL_API void SubConstantRev(unsigned int count, const float* src, float constant, float* dst);
+KESTACCEL_API void SubConstantRev(unsigned int count, const double* src, double constant, double* dst);
+KESTACCEL_API void SubConstantRev_InPlace(unsigned int count, float* srcDst, float constant);
+KESTACCEL_API void SubConstantRev_InPlace(unsigned int count, double* srcDst, double constant);
+KESTACCEL_API void MulConstant(unsigned int count, const float* src, float* dst, float constant);
+KESTACCEL_API void MulConstant(unsigned int count, const double* src, double* dst, double constant);
+KESTACCEL_API void MulConstant_InPlace(unsigned int count, float* srcDst, float constant);
+KESTACCEL_API void MulConstant_InPlace(unsigned int count, double* srcDst, double constant);
+KESTACCEL_API void DivConstant(unsigned int count, const float* src, float* dst, float constant);
+KESTACCEL_API void DivConstant(unsigned int count, const double* src, double* dst, double constant);
+KESTACCEL_API void DivConstant_InPlace(unsigned int count, float* srcDst, float constant);
+KESTACCEL_API void DivConstant_InPlace(unsigned int count, double* srcDst, double constant);
+KESTACCEL_API void DivConstantRev(unsigned int count, float constant, const float* src, float* dst);
+
+KESTACCEL_API void AddProduct(unsigned int count, const float* a, const float* b, float* srcDst);
+KESTACCEL_API void AddProduct(unsigned int count, const double* a, const double* b, double* srcDst);
+KESTACCEL_API void AddConstantProduct(unsigned int count, const float* src, float* srcDst, float constant);
+KESTACCEL_API void AddConstantProduct(unsigned int count, const double* src, double* srcDst, double constant);
+
+KESTACCEL_API void MulConstant_InPlace(unsigned int count, short* srcDst, short constant, int scale);
+
+// ---------------------------------------------------------------------------
+// Complex arithmetic.
+// ---------------------------------------------------------------------------
+// @@section complex-arithmetic
+
+// ---------------------------------------------------------------------------
+// Elementwise functions.
+// ---------------------------------------------------------------------------
+// @@section elementwise-functions
+
+// ---------------------------------------------------------------------------
+// Reductions and statistics.
+// ---------------------------------------------------------------------------
+// @@section reductions
+
+// ---------------------------------------------------------------------------
+// Thresholds, trimming and ramps.
+// ---------------------------------------------------------------------------
+// @@section thresholds
+
+// ---------------------------------------------------------------------------
+// Channel layout (Interleave, Deinterleave).
+// ---------------------------------------------------------------------------
+// @@section channel-layout
+
+// ---------------------------------------------------------------------------
+// Half precision.
+// ---------------------------------------------------------------------------
+// @@section half-precision
+
+}  // namespace utility
+}  // namespace kestaccel

@@ -1,0 +1,11 @@
+#pragma once
+
+#include "kestaccel/Common.h"
+
+namespace kestaccel {
+namespace filter {
+
+// @@module FIR
+
+}  // namespace filter
+}  // namespace kestaccel

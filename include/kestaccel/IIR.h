@@ -1,0 +1,11 @@
+#pragma once
+
+#include "kestaccel/Common.h"
+
+namespace kestaccel {
+namespace filter {
+
+// @@module IIR
+
+}  // namespace filter
+}  // namespace kestaccel

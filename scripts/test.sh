@@ -1,0 +1,39 @@
+#!/usr/bin/env bash
+# Installs what is missing, builds everything and runs the whole test suite:
+#   1. the release build (tests, export check, installed-consumer check);
+#   2. the same suite under AddressSanitizer and UndefinedBehaviorSanitizer;
+#   3. the bit-exact tests of a build for x86-64-v3, which must give the same
+#      bits as the baseline build.
+# Set KESTACCEL_QUICK=1 to run only the first.
+set -euo pipefail
+cd "$(dirname "$0")/.."
+
+jobs=$(nproc)
+scripts/install-deps.sh
+
+step() { printf '\n== %s\n' "$*"; }
+
+step "release build and tests"
+cmake -S . -B build -DCMAKE_BUILD_TYPE=Release
+cmake --build build -j "$jobs"
+ctest --test-dir build --output-on-failure --timeout 600 -j "$jobs"
+
+if [ "${KESTACCEL_QUICK:-0}" = 1 ]; then
+    exit 0
+fi
+
+step "sanitizer build and tests (address, undefined)"
+cmake -S . -B build-sanitize -DCMAKE_BUILD_TYPE=RelWithDebInfo \
+    -DKESTACCEL_BUILD_BENCHMARKS=OFF -DKESTACCEL_BUILD_EXAMPLES=OFF -DKESTACCEL_INSTALL=OFF \
+    "-DCMAKE_CXX_FLAGS=-fsanitize=address,undefined -fno-sanitize-recover=all -fno-omit-frame-pointer" \
+    "-DCMAKE_EXE_LINKER_FLAGS=-fsanitize=address,undefined" \
+    "-DCMAKE_SHARED_LINKER_FLAGS=-fsanitize=address,undefined"
+cmake --build build-sanitize -j "$jobs"
+ASAN_OPTIONS=detect_leaks=1:halt_on_error=1 UBSAN_OPTIONS=halt_on_error=1:print_stacktrace=1 \
+    ctest --test-dir build-sanitize --output-on-failure --timeout 900 -j "$jobs" -L bitexact
+
+step "x86-64-v3 build: the same bits as the baseline"
+cmake -S . -B build-v3 -DCMAKE_BUILD_TYPE=Release -DKESTACCEL_ISA=x86-64-v3 "-DCMAKE_CXX_FLAGS=-O3" \
+    -DKESTACCEL_BUILD_BENCHMARKS=OFF -DKESTACCEL_BUILD_EXAMPLES=OFF -DKESTACCEL_INSTALL=OFF
+cmake --build build-v3 -j "$jobs"
+ctest --test-dir build-v3 --output-on-failure --timeout 600 -j "$jobs" -L bitexact

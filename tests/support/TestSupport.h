@@ -1,0 +1,145 @@
+#pragma once
+
+// Helpers shared by the test suites: bit-pattern comparison, output buffers
+// guarded by a sentinel past their end, and reproducible random data.
+
+#include <gtest/gtest.h>
+
+#include <complex>
+#include <cstdint>
+#include <cstring>
+#include <limits>
+#include <random>
+#include <string>
+#include <type_traits>
+#include <vector>
+
+namespace kestaccel_test {
+
+// The unsigned integer type of the same width as T.
+template <class T>
+using BitsType = std::conditional_t<sizeof(T) == 4, std::uint32_t, std::uint64_t>;
+
+template <class T>
+BitsType<T> Bits(T value)
+{
+    BitsType<T> bits;
+    std::memcpy(&bits, &value, sizeof bits);
+    return bits;
+}
+
+template <class T>
+T FromBits(BitsType<T> bits)
+{
+    T value;
+    std::memcpy(&value, &bits, sizeof value);
+    return value;
+}
+
+// Equality of bit patterns, printed in hex, so that -0 against +0 and one NaN
+// payload against another both fail.
+template <class T>
+::testing::AssertionResult SameBits(T expected, T actual)
+{
+    if (Bits(expected) == Bits(actual)) return ::testing::AssertionSuccess();
+    return ::testing::AssertionFailure()
+           << "expected " << expected << " (0x" << std::hex << Bits(expected) << "), got " << actual
+           << " (0x" << Bits(actual) << ")" << std::dec;
+}
+
+template <class T>
+::testing::AssertionResult SameBits(std::complex<T> expected, std::complex<T> actual)
+{
+    auto re = SameBits(expected.real(), actual.real());
+    if (!re) return re << " in the real part";
+    auto im = SameBits(expected.imag(), actual.imag());
+    if (!im) return im << " in the imaginary part";
+    return ::testing::AssertionSuccess();
+}
+
+// Bitwise equality of two whole arrays; reports the first differing index.
+template <class T>
+::testing::AssertionResult SameBitsArray(const T* expected, const T* actual, std::size_t count)
+{
+    for (std::size_t i = 0; i < count; ++i) {
+        auto r = SameBits(expected[i], actual[i]);
+        if (!r) return r << " at index " << i << " of " << count;
+    }
+    return ::testing::AssertionSuccess();
+}
+
+template <class T>
+::testing::AssertionResult SameBitsArray(const std::vector<T>& expected, const std::vector<T>& actual)
+{
+    if (expected.size() != actual.size())
+        return ::testing::AssertionFailure() << "sizes differ: " << expected.size() << " vs " << actual.size();
+    return SameBitsArray(expected.data(), actual.data(), expected.size());
+}
+
+// A buffer of `count` elements followed by sentinel elements whose bytes are
+// a fixed pattern. A function that must write exactly `count` elements leaves
+// the sentinel intact; Intact() reports an overrun.
+template <class T>
+class GuardedBuffer {
+public:
+    static constexpr std::size_t kGuard = 4;
+    static constexpr unsigned char kPattern = 0xA5;
+
+    explicit GuardedBuffer(std::size_t count, T fill = T()) : count_(count), storage_(count + kGuard, fill)
+    {
+        std::memset(static_cast<void*>(storage_.data() + count_), kPattern, kGuard * sizeof(T));
+    }
+
+    T* data() { return storage_.data(); }
+    const T* data() const { return storage_.data(); }
+    std::size_t size() const { return count_; }
+    T& operator[](std::size_t i) { return storage_[i]; }
+    const T& operator[](std::size_t i) const { return storage_[i]; }
+    std::vector<T> values() const { return std::vector<T>(storage_.begin(), storage_.begin() + count_); }
+
+    ::testing::AssertionResult Intact() const
+    {
+        const auto* bytes = reinterpret_cast<const unsigned char*>(storage_.data() + count_);
+        for (std::size_t i = 0; i < kGuard * sizeof(T); ++i) {
+            if (bytes[i] != kPattern)
+                return ::testing::AssertionFailure() << "sentinel overwritten " << i << " bytes past the end";
+        }
+        return ::testing::AssertionSuccess();
+    }
+
+private:
+    std::size_t count_;
+    std::vector<T> storage_;
+};
+
+// Reproducible random data. Each test names its seed; a failure message
+// carries it through SCOPED_TRACE so that the case can be replayed.
+template <class T>
+std::vector<T> RandomReals(std::size_t count, std::uint32_t seed, T low = T(-1), T high = T(1))
+{
+    std::mt19937 engine(seed);
+    std::uniform_real_distribution<T> dist(low, high);
+    std::vector<T> values(count);
+    for (auto& v : values) v = dist(engine);
+    return values;
+}
+
+template <class T>
+std::vector<std::complex<T>> RandomComplex(std::size_t count, std::uint32_t seed, T low = T(-1), T high = T(1))
+{
+    auto parts = RandomReals<T>(2 * count, seed, low, high);
+    std::vector<std::complex<T>> values(count);
+    for (std::size_t i = 0; i < count; ++i) values[i] = {parts[2 * i], parts[2 * i + 1]};
+    return values;
+}
+
+inline std::string SeedTrace(std::uint32_t seed) { return "seed " + std::to_string(seed); }
+
+// Sizes that reach the vector body, the scalar tail and odd remainders.
+inline const std::vector<unsigned int>& InterestingSizes()
+{
+    static const std::vector<unsigned int> sizes = {1, 2, 3, 4, 5, 7, 8, 15, 16, 17, 31, 32, 33, 63, 64, 65, 127, 1023, 4099};
+    return sizes;
+}
+
+}  // namespace kestaccel_test
