@@ -116,7 +116,28 @@ KESTACCEL_API void MulConstant_InPlace(unsigned int count, short* srcDst, short 
 // ---------------------------------------------------------------------------
 // Channel layout (Interleave, Deinterleave).
 // ---------------------------------------------------------------------------
-// @@section channel-layout
+//
+// Interleave(n, a, b, dst)        dst[2i] = a[i], dst[2i + 1] = b[i]
+// Deinterleave(n, src, a, b)      a[i] = src[2i], b[i] = src[2i + 1]
+// Interleave(channels, frames, sources, dst)
+// Deinterleave(channels, frames, src, destinations)
+//
+// Element c of frame f of an interleaved buffer stands at f * channels + c.
+// The N-channel forms take the number of channels first, then frames, and an
+// array of `channels` pointers that is read anew for every element, so it
+// must stay valid and unchanged for the whole call. The interleaved buffer is
+// walked in memory order (frames outer, channels inner); one channel copies.
+// Values move unchanged, bits and all. With 0 frames or 0 channels nothing is
+// touched and the pointer array is not read.
+// ---------------------------------------------------------------------------
+KESTACCEL_API void Interleave(unsigned int count, const float* a, const float* b, float* dst);
+KESTACCEL_API void Interleave(unsigned int count, const double* a, const double* b, double* dst);
+KESTACCEL_API void Interleave(unsigned int channels, unsigned int frames, const float* const* sources, float* dst);
+KESTACCEL_API void Interleave(unsigned int channels, unsigned int frames, const double* const* sources, double* dst);
+KESTACCEL_API void Deinterleave(unsigned int count, const float* src, float* a, float* b);
+KESTACCEL_API void Deinterleave(unsigned int count, const double* src, double* a, double* b);
+KESTACCEL_API void Deinterleave(unsigned int channels, unsigned int frames, const float* src, float* const* destinations);
+KESTACCEL_API void Deinterleave(unsigned int channels, unsigned int frames, const double* src, double* const* destinations);
 
 // ---------------------------------------------------------------------------
 // Half precision.
