@@ -100,7 +100,22 @@ KESTACCEL_API void SetDenormalExceptionsEnabled(bool enable);
 // ---------------------------------------------------------------------------
 // Byte order (SwapBytes).
 // ---------------------------------------------------------------------------
-// @@section byte-order
+//
+// Reverses the bytes of each word: 16-bit words exchange their two bytes,
+// 32- and 64-bit words are reversed in full, and a packed 24-bit word
+// exchanges bytes 0 and 2 and keeps byte 1. The in-place form takes
+// (count, data); the other writes to dst and leaves src untouched, and with
+// src == dst it gives the in-place result. Elements go in ascending order;
+// swapping twice gives the data back. There is no SwapBytes of floats.
+// ---------------------------------------------------------------------------
+KESTACCEL_API void SwapBytes(unsigned int count, unsigned short* data);
+KESTACCEL_API void SwapBytes(unsigned int count, unsigned int* data);
+KESTACCEL_API void SwapBytes(unsigned int count, kestcore::utility::int24_t* data);
+KESTACCEL_API void SwapBytes(unsigned int count, unsigned long long* data);
+KESTACCEL_API void SwapBytes(unsigned int count, const unsigned short* src, unsigned short* dst);
+KESTACCEL_API void SwapBytes(unsigned int count, const unsigned int* src, unsigned int* dst);
+KESTACCEL_API void SwapBytes(unsigned int count, const kestcore::utility::int24_t* src, kestcore::utility::int24_t* dst);
+KESTACCEL_API void SwapBytes(unsigned int count, const unsigned long long* src, unsigned long long* dst);
 
 }  // namespace utility
 }  // namespace kestaccel
