@@ -105,8 +105,78 @@ KESTACCEL_API void MulConstant_InPlace(unsigned int count, short* srcDst, short 
 
 // ---------------------------------------------------------------------------
 // Reductions and statistics.
+//
+// Sums, means and norms accumulate strictly in ascending index order from +0
+// in one accumulator of the element's type: no partial sums, no pairing, no
+// compensation. So Sum of {1e8f, 1, -1e8f} is 0 and a sum of -0 elements is
+// +0. Count 0 gives 0.
+//
+//   Sum(n, src)                    src[0] + src[1] + ...
+//   Mean(n, src)                   Sum / n, n converted from its unsigned value
+//   NormL1(n, src)                 sum of |src[i]|
+//   NormL2(n, src)                 sqrt of the sum of squares. On float each
+//                                  square is rounded to float (it overflows
+//                                  and underflows as a float) and only the
+//                                  sum runs in double; the root is rounded
+//                                  once to float.
+//   StandardDeviation(n, src, r)   sample deviation: two passes (mean, then
+//                                  squared deviations), divided by n - 1.
+//                                  For n < 2 `r` is not written.
+//
+// Scans report positions; all tests are strict, and a NaN never wins a
+// comparison, so a NaN at element 0 stays the result of Max/Min/MaxIndex/
+// MinIndex. Max, Min, MinMax with references and MinMaxIndex read src[0]
+// even for count 0.
+//
+//   Max, Min, MaxIndex, MinIndex   the first of equal elements wins. The index
+//                                  functions return 0 for count 0 and store
+//                                  the element through `value` unless null.
+//   MinMax(n, src, min, max),      one paired scan: the minimum is the first
+//   MinMaxIndex(n, src, min, max,  of the smallest elements, the maximum the
+//               minIdx, maxIdx)    LAST of the largest (MaxIndex of {1,3,3,2}
+//                                  is 1, MinMaxIndex's maximum index is 2).
+//   MinMax(src, n)                 peak magnitude: the larger of -minimum and
+//                                  maximum (pointer first, count second).
+//                                  Count 0 gives 0; with a NaN the maximum
+//                                  element is returned.
+//
+//   MaxEvery(n, a, b, dst)         b[i] if b[i] > a[i], else a[i]
+//   MaxEvery_InPlace(n, src, sd)   sd[i] if sd[i] > src[i], else src[i]
+//   MinEvery(n, a, b, dst)         b[i] if a[i] > b[i], else a[i]
+//   MinEvery_InPlace(n, src, sd)   sd[i] if src[i] > sd[i], else src[i]
+// The selected element is copied bit for bit; on equal values, +0 against -0
+// or a NaN the first vector's element is taken, so a NaN there propagates
+// and a NaN in the second vector does not.
+//
+// Only float has MaxIndex, MinIndex, MinMax, MinMaxIndex, MaxEvery and
+// MinEvery. DotProduct is declared in kestaccel/DSP.h.
 // ---------------------------------------------------------------------------
-// @@section reductions
+KESTACCEL_API float Sum(unsigned int count, const float* src);
+KESTACCEL_API double Sum(unsigned int count, const double* src);
+KESTACCEL_API float Mean(unsigned int count, const float* src);
+KESTACCEL_API double Mean(unsigned int count, const double* src);
+KESTACCEL_API float NormL1(unsigned int count, const float* src);
+KESTACCEL_API double NormL1(unsigned int count, const double* src);
+KESTACCEL_API float NormL2(unsigned int count, const float* src);
+KESTACCEL_API double NormL2(unsigned int count, const double* src);
+KESTACCEL_API void StandardDeviation(unsigned int count, const float* src, float& result);
+KESTACCEL_API void StandardDeviation(unsigned int count, const double* src, double& result);
+
+KESTACCEL_API float Max(unsigned int count, const float* src);
+KESTACCEL_API double Max(unsigned int count, const double* src);
+KESTACCEL_API float Min(unsigned int count, const float* src);
+KESTACCEL_API double Min(unsigned int count, const double* src);
+KESTACCEL_API unsigned int MaxIndex(unsigned int count, const float* src, float* value);
+KESTACCEL_API unsigned int MinIndex(unsigned int count, const float* src, float* value);
+KESTACCEL_API void MinMax(unsigned int count, const float* src, float& minimum, float& maximum);
+KESTACCEL_API float MinMax(const float* src, unsigned int count);
+KESTACCEL_API void MinMaxIndex(unsigned int count, const float* src, float& minimum, float& maximum,
+                               unsigned int& minimumIndex, unsigned int& maximumIndex);
+
+KESTACCEL_API void MaxEvery(unsigned int count, const float* a, const float* b, float* dst);
+KESTACCEL_API void MaxEvery_InPlace(unsigned int count, const float* src, float* srcDst);
+KESTACCEL_API void MinEvery(unsigned int count, const float* a, const float* b, float* dst);
+KESTACCEL_API void MinEvery_InPlace(unsigned int count, const float* src, float* srcDst);
 
 // ---------------------------------------------------------------------------
 // Thresholds, trimming and ramps.
