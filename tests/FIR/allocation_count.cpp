@@ -1,0 +1,53 @@
+#include "AllocationCount.h"
+
+#include <atomic>
+#include <cstdlib>
+#include <new>
+
+namespace {
+
+std::atomic<std::size_t> g_news{0};
+std::atomic<std::size_t> g_deletes{0};
+std::atomic<std::size_t> g_largest{0};
+
+void* CountedAllocate(std::size_t size)
+{
+    g_news.fetch_add(1);
+    std::size_t seen = g_largest.load();
+    while (size > seen && !g_largest.compare_exchange_weak(seen, size)) {
+    }
+    if (void* p = std::malloc(size == 0 ? 1 : size)) return p;
+    throw std::bad_alloc();
+}
+
+void CountedRelease(void* p)
+{
+    if (p == nullptr) return;
+    g_deletes.fetch_add(1);
+    std::free(p);
+}
+
+}  // namespace
+
+void* operator new(std::size_t size) { return CountedAllocate(size); }
+void* operator new[](std::size_t size) { return CountedAllocate(size); }
+void operator delete(void* p) noexcept { CountedRelease(p); }
+void operator delete[](void* p) noexcept { CountedRelease(p); }
+void operator delete(void* p, std::size_t) noexcept { CountedRelease(p); }
+void operator delete[](void* p, std::size_t) noexcept { CountedRelease(p); }
+
+namespace kestaccel_test {
+
+AllocationTally CurrentAllocationTally()
+{
+    return {g_news.load(), g_deletes.load(), g_largest.load()};
+}
+
+void ResetAllocationTally()
+{
+    g_news.store(0);
+    g_deletes.store(0);
+    g_largest.store(0);
+}
+
+}  // namespace kestaccel_test
