@@ -54,7 +54,20 @@ KESTACCEL_API void FIRFree(FIRState_Float* state);
 // ---------------------------------------------------------------------------
 // Lowpass FIR design.
 // ---------------------------------------------------------------------------
-// @@section lowpass-design
+// Fills taps[0 .. tapCount - 1] with a linear-phase lowpass filter by the
+// window method, in double. cutoff is a fraction of the sampling frequency
+// (0.5 is Nyquist), not range-checked. The ideal response sin(x c) / x with
+// c = 2 cutoff is sampled around the array's centre (on the middle tap for
+// odd counts, between the two middle taps for even ones, x advancing by pi
+// per tap), then multiplied in place by the window windowType selects:
+// kDSPWindowBartlett, kDSPWindowHamming or kDSPWindowHann; any other value,
+// 1 included, applies none. With normalize, the taps are scaled by
+// 1 / (2 |sum of the left half| + centre tap), so that their sum is 1, or -1
+// when the left half sums to a negative value; a zero sum gives NaN taps.
+// workBuffer is never read or written and may be null.
+KESTACCEL_API void GenerateLowpassFIRCoefficients(double cutoff, unsigned int tapCount, double* taps,
+                                                  utility::DSPWindowType windowType, bool normalize,
+                                                  unsigned char* workBuffer);
 
 }  // namespace filter
 }  // namespace kestaccel
