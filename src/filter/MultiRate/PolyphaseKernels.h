@@ -1,0 +1,192 @@
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+
+#include "filter/MultiRate/MultiRateState.h"
+
+// The outputs of the polyphase filter. Every output is one sum, started at
+// +0 in the element type, over the L taps of its branch and the L samples
+// that end at its newest input, from the oldest sample to the newest, each
+// product rounded on its own. The faster paths below compute several outputs
+// at once, each with its own accumulator running in that same order, so they
+// give the bits of the plain loop.
+namespace kestaccel {
+namespace filter {
+namespace cpp {
+namespace polyphase {
+
+// Outputs computed side by side on the vector path: one from each of eight
+// consecutive rate-change cycles. Outputs U apart use the same branch and
+// samples D apart, so the eight sums share every tap.
+constexpr std::size_t kLanes = 8;
+
+// Rows of the stack tile that holds, for eight cycles side by side, the
+// samples of one cycle. It bounds L + D on the vector path.
+constexpr std::int64_t kTileRows = 512;
+
+// A position on the high-rate axis, stepped by D from one output to the next.
+struct Position {
+    std::uint32_t phase;
+    std::int64_t inputIndex;
+};
+
+struct Step {
+    std::uint32_t up;
+    std::uint32_t downQuotient;   // D / U
+    std::uint32_t downRemainder;  // D % U
+};
+
+inline Step MakeStep(std::uint32_t up, std::uint32_t down) { return {up, down / up, down % up}; }
+
+// Adds D to the phase and carries whole multiples of U into inputIndex.
+inline void Advance(Position& position, const Step& step)
+{
+    std::uint64_t phase = std::uint64_t(position.phase) + step.downRemainder;
+    position.inputIndex += step.downQuotient;
+    if (phase >= step.up) {
+        phase -= step.up;
+        position.inputIndex += 1;
+    }
+    position.phase = static_cast<std::uint32_t>(phase);
+}
+
+// An output whose window may begin before the block: samples before index 0
+// come from history, newest first.
+template <class T>
+T OutputReachingHistory(const T* branch, std::int64_t length, std::int64_t newest, const T* src, const T* history)
+{
+    T sum = T(0);
+    for (std::int64_t j = 0; j < length; ++j) {
+        const std::int64_t s = newest - length + 1 + j;
+        const T sample = s >= 0 ? src[s] : history[-s - 1];
+        sum += sample * branch[j];
+    }
+    return sum;
+}
+
+// An output whose window lies wholly in the block, starting at `window`.
+template <class T>
+T OutputFromBlock(const T* branch, std::size_t length, const T* window)
+{
+    T sum = T(0);
+    for (std::size_t j = 0; j < length; ++j) sum += window[j] * branch[j];
+    return sum;
+}
+
+// Four consecutive outputs, four independent sums: the additions of one sum
+// no longer wait on each other's latency.
+template <class T>
+void FourOutputsFromBlock(const T* const* branches, const T* const* windows, std::size_t length, T* dst)
+{
+    T sum0 = T(0), sum1 = T(0), sum2 = T(0), sum3 = T(0);
+    for (std::size_t j = 0; j < length; ++j) {
+        sum0 += windows[0][j] * branches[0][j];
+        sum1 += windows[1][j] * branches[1][j];
+        sum2 += windows[2][j] * branches[2][j];
+        sum3 += windows[3][j] * branches[3][j];
+    }
+    dst[0] = sum0;
+    dst[1] = sum1;
+    dst[2] = sum2;
+    dst[3] = sum3;
+}
+
+// kLanes sums over one branch: lane k reads rows[j * rowStride + k]. The lane
+// loop is the vector; each lane still adds its products in ascending j.
+template <class T>
+void LaneSums(const T* rows, std::size_t rowStride, const T* branch, std::size_t length, T* sums)
+{
+    T acc[kLanes] = {};
+    for (std::size_t j = 0; j < length; ++j) {
+        const T tap = branch[j];
+        const T* row = rows + j * rowStride;
+        for (std::size_t k = 0; k < kLanes; ++k) acc[k] += row[k] * tap;
+    }
+    for (std::size_t k = 0; k < kLanes; ++k) sums[k] = acc[k];
+}
+
+// kLanes whole cycles from `position`, whose window must lie in the block.
+// Lane k is the cycle k further on: same branches, samples k * D later. At D
+// of 1 those samples are already side by side in src; otherwise they are
+// first gathered into `tile`, one row per sample offset of the cycle.
+template <class T>
+void CycleLanes(const PoolVector<PoolVector<T>>& branches, std::size_t length, const Step& step,
+                std::uint32_t down, const T* src, T* dst, Position& position, T* tile)
+{
+    const std::int64_t first = position.inputIndex - std::int64_t(length) + 1;
+    const T* rows = src + first;
+    std::size_t rowStride = 1;
+    if (down != 1) {
+        const std::uint64_t reach = (std::uint64_t(position.phase) + std::uint64_t(step.up - 1) * down) / step.up;
+        const std::int64_t rowCount = std::int64_t(length) + std::int64_t(reach);
+        for (std::int64_t r = 0; r < rowCount; ++r) {
+            const T* column = src + first + r;
+            for (std::size_t k = 0; k < kLanes; ++k) tile[r * std::int64_t(kLanes) + std::int64_t(k)] = column[k * down];
+        }
+        rows = tile;
+        rowStride = kLanes;
+    }
+    T sums[kLanes];
+    for (std::uint32_t t = 0; t < step.up; ++t) {
+        const std::int64_t offset = position.inputIndex - std::int64_t(length) + 1 - first;
+        LaneSums(rows + offset * std::int64_t(rowStride), rowStride, branches[position.phase].data(), length, sums);
+        for (std::size_t k = 0; k < kLanes; ++k) dst[k * step.up + t] = sums[k];
+        Advance(position, step);
+    }
+    // The walk above covered one cycle; the lanes covered kLanes.
+    position.inputIndex += std::int64_t(kLanes - 1) * down;
+}
+
+// Writes `count` outputs from `position` on, and leaves `position` after them.
+// The position never moves back within a call, so the outputs that reach
+// into history all come first, and the rest need no test per sample.
+template <class T>
+void ComputeOutputs(const MultiRateRecord<T>& filter, const T* src, T* dst, std::int64_t count, Position& position)
+{
+    const std::uint32_t up = filter.upFactor;
+    const std::uint32_t down = filter.downFactor;
+    const Step step = MakeStep(up, down);
+    const auto& branches = filter.phaseFilters;
+    const std::size_t length = branches[0].size();
+    const std::int64_t lengthSigned = std::int64_t(length);
+
+    std::int64_t n = 0;
+    for (; n < count && position.inputIndex < lengthSigned - 1; ++n) {
+        dst[n] = OutputReachingHistory(branches[position.phase].data(), lengthSigned, position.inputIndex, src,
+                                       filter.history.data());
+        Advance(position, step);
+    }
+
+    // Gathering a tile costs (L + D) * kLanes copies against U * L * kLanes
+    // products; when it would cost more than it saves, stay on the scalar path.
+    const std::int64_t cycleOutputs = std::int64_t(kLanes) * up;
+    const std::int64_t tileRows = lengthSigned + std::int64_t(down);
+    const bool lanes = length > 0 && (down == 1 || (tileRows <= kTileRows && tileRows <= std::int64_t(up) * lengthSigned));
+    if (lanes && count - n >= cycleOutputs) {
+        T tile[kTileRows * kLanes];
+        for (; count - n >= cycleOutputs; n += cycleOutputs) {
+            CycleLanes(branches, length, step, down, src, dst + n, position, tile);
+        }
+    }
+
+    for (; count - n >= 4; n += 4) {
+        const T* groupBranches[4];
+        const T* groupWindows[4];
+        for (int k = 0; k < 4; ++k) {
+            groupBranches[k] = branches[position.phase].data();
+            groupWindows[k] = src + (position.inputIndex - lengthSigned + 1);
+            Advance(position, step);
+        }
+        FourOutputsFromBlock(groupBranches, groupWindows, length, dst + n);
+    }
+    for (; n < count; ++n) {
+        dst[n] = OutputFromBlock(branches[position.phase].data(), length, src + (position.inputIndex - lengthSigned + 1));
+        Advance(position, step);
+    }
+}
+
+}  // namespace polyphase
+}  // namespace cpp
+}  // namespace filter
+}  // namespace kestaccel
