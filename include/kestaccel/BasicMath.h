@@ -96,7 +96,78 @@ KESTACCEL_API void MulConstant_InPlace(unsigned int count, short* srcDst, short 
 // ---------------------------------------------------------------------------
 // Complex arithmetic.
 // ---------------------------------------------------------------------------
-// @@section complex-arithmetic
+// The names, operand order and zero tests of the real family, on
+// std::complex<float> and std::complex<double> elements; all arithmetic is on
+// the components in their own type.
+//
+//   Add, Add_InPlace, AddConstant      component-wise sums (constant first)
+//   Sub(n, a, b, dst)                  dst[i] = b[i] - a[i]  (second minus first)
+//   Sub_InPlace(n, src, srcDst)        srcDst[i] = srcDst[i] - src[i]
+//   SubConstant, SubConstantRev        src[i] - c, c - src[i]
+//   Mul, Mul_InPlace, MulConstant      x * y, x the first operand, y the second
+//                                      (src[i], then srcDst[i] or c)
+//   AddProduct(n, a, b, srcDst)        srcDst[i] = (a[i] * b[i]) + srcDst[i]
+//   Div(n, a, b, dst)                  dst[i] = b[i] / a[i]  (second over first)
+//   Div_InPlace(n, src, srcDst)        srcDst[i] = srcDst[i] / src[i]
+//   DivConstant, DivConstant_InPlace   src[i] / c
+//
+// The product is the plain formula on the components,
+//   (xr * yr - xi * yi, xr * yi + xi * yr),
+// every product rounded, then the difference and the sum; nothing repairs
+// infinities, so (inf, 0) * (1, 0) is (inf, NaN). AddProduct rounds the
+// product's parts before adding srcDst.
+//
+// The quotient u / v is Smith's scaled division: when |vr| > |vi| it scales
+// by w = vi / vr, otherwise (equal sizes included) by w = vr / vi. A
+// denominator that is zero, has a NaN part, or whose scaled size d is zero or
+// NaN gives (NaN, NaN), the quiet NaN with a clear sign and zero payload
+// (0x7FC00000, 0x7FF8000000000000) in both parts; it never gives an infinity.
+// A NaN numerator just travels through. Div and Div_InPlace have no
+// whole-call test, so a zero element of the divisor marks only its own
+// index. DivConstant and DivConstant_InPlace return at once, writing nothing,
+// when both parts of the constant compare equal to zero.
+//
+// There is no complex AddConstantProduct and no complex DivConstantRev.
+
+KESTACCEL_API void Add(unsigned int count, const std::complex<float>* a, const std::complex<float>* b, std::complex<float>* dst);
+KESTACCEL_API void Add(unsigned int count, const std::complex<double>* a, const std::complex<double>* b, std::complex<double>* dst);
+KESTACCEL_API void Add_InPlace(unsigned int count, const std::complex<float>* src, std::complex<float>* srcDst);
+KESTACCEL_API void Add_InPlace(unsigned int count, const std::complex<double>* src, std::complex<double>* srcDst);
+KESTACCEL_API void Sub(unsigned int count, const std::complex<float>* a, const std::complex<float>* b, std::complex<float>* dst);
+KESTACCEL_API void Sub(unsigned int count, const std::complex<double>* a, const std::complex<double>* b, std::complex<double>* dst);
+KESTACCEL_API void Sub_InPlace(unsigned int count, const std::complex<float>* src, std::complex<float>* srcDst);
+KESTACCEL_API void Sub_InPlace(unsigned int count, const std::complex<double>* src, std::complex<double>* srcDst);
+KESTACCEL_API void AddConstant(unsigned int count, const std::complex<float>* src, std::complex<float> constant, std::complex<float>* dst);
+KESTACCEL_API void AddConstant(unsigned int count, const std::complex<double>* src, std::complex<double> constant, std::complex<double>* dst);
+KESTACCEL_API void AddConstant_InPlace(unsigned int count, std::complex<float>* srcDst, std::complex<float> constant);
+KESTACCEL_API void AddConstant_InPlace(unsigned int count, std::complex<double>* srcDst, std::complex<double> constant);
+KESTACCEL_API void SubConstant(unsigned int count, const std::complex<float>* src, std::complex<float> constant, std::complex<float>* dst);
+KESTACCEL_API void SubConstant(unsigned int count, const std::complex<double>* src, std::complex<double> constant, std::complex<double>* dst);
+KESTACCEL_API void SubConstant_InPlace(unsigned int count, std::complex<float>* srcDst, std::complex<float> constant);
+KESTACCEL_API void SubConstant_InPlace(unsigned int count, std::complex<double>* srcDst, std::complex<double> constant);
+KESTACCEL_API void SubConstantRev(unsigned int count, const std::complex<float>* src, std::complex<float> constant, std::complex<float>* dst);
+KESTACCEL_API void SubConstantRev(unsigned int count, const std::complex<double>* src, std::complex<double> constant, std::complex<double>* dst);
+KESTACCEL_API void SubConstantRev_InPlace(unsigned int count, std::complex<float>* srcDst, std::complex<float> constant);
+KESTACCEL_API void SubConstantRev_InPlace(unsigned int count, std::complex<double>* srcDst, std::complex<double> constant);
+KESTACCEL_API void Mul(unsigned int count, const std::complex<float>* a, const std::complex<float>* b, std::complex<float>* dst);
+KESTACCEL_API void Mul(unsigned int count, const std::complex<double>* a, const std::complex<double>* b, std::complex<double>* dst);
+KESTACCEL_API void Mul_InPlace(unsigned int count, const std::complex<float>* src, std::complex<float>* srcDst);
+KESTACCEL_API void Mul_InPlace(unsigned int count, const std::complex<double>* src, std::complex<double>* srcDst);
+KESTACCEL_API void MulConstant(unsigned int count, const std::complex<float>* src, std::complex<float>* dst, std::complex<float> constant);
+KESTACCEL_API void MulConstant(unsigned int count, const std::complex<double>* src, std::complex<double>* dst, std::complex<double> constant);
+KESTACCEL_API void MulConstant_InPlace(unsigned int count, std::complex<float>* srcDst, std::complex<float> constant);
+KESTACCEL_API void MulConstant_InPlace(unsigned int count, std::complex<double>* srcDst, std::complex<double> constant);
+KESTACCEL_API void AddProduct(unsigned int count, const std::complex<float>* a, const std::complex<float>* b, std::complex<float>* srcDst);
+KESTACCEL_API void AddProduct(unsigned int count, const std::complex<double>* a, const std::complex<double>* b, std::complex<double>* srcDst);
+KESTACCEL_API void Div(unsigned int count, const std::complex<float>* a, const std::complex<float>* b, std::complex<float>* dst);
+KESTACCEL_API void Div(unsigned int count, const std::complex<double>* a, const std::complex<double>* b, std::complex<double>* dst);
+KESTACCEL_API void Div_InPlace(unsigned int count, const std::complex<float>* src, std::complex<float>* srcDst);
+KESTACCEL_API void Div_InPlace(unsigned int count, const std::complex<double>* src, std::complex<double>* srcDst);
+KESTACCEL_API void DivConstant(unsigned int count, const std::complex<float>* src, std::complex<float>* dst, std::complex<float> constant);
+KESTACCEL_API void DivConstant(unsigned int count, const std::complex<double>* src, std::complex<double>* dst, std::complex<double> constant);
+KESTACCEL_API void DivConstant_InPlace(unsigned int count, std::complex<float>* srcDst, std::complex<float> constant);
+KESTACCEL_API void DivConstant_InPlace(unsigned int count, std::complex<double>* srcDst, std::complex<double> constant);
+
 
 // ---------------------------------------------------------------------------
 // Elementwise functions.
