@@ -10,3 +10,14 @@ if(NOT MSVC)
     set_source_files_properties(${CMAKE_CURRENT_SOURCE_DIR}/filter/FIR/FIR.cpp
         PROPERTIES COMPILE_OPTIONS "-O2")
 endif()
+
+# Sample conversion: the limit, rounding and range tests are selects, and
+# under the default trapping-math rules g++ keeps them as branches (a
+# comparison or product of a NaN might raise a flag the source would not
+# have raised), so the loops stay scalar. No flag is read and no trap is
+# enabled here, so -fno-trapping-math changes no bit; the conversion tests
+# compare every path with a plain loop around the runtime's lroundf.
+if(NOT MSVC)
+    set_source_files_properties(${CMAKE_CURRENT_SOURCE_DIR}/utility/VectorUtils/Conversion.cpp
+        PROPERTIES COMPILE_OPTIONS "-fno-trapping-math")
+endif()

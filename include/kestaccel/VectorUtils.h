@@ -95,7 +95,53 @@ KESTACCEL_API void SetDenormalExceptionsEnabled(bool enable);
 // ---------------------------------------------------------------------------
 // Sample conversion (Convert).
 // ---------------------------------------------------------------------------
-// @@section sample-conversion
+//
+// Full scale goes through a binary exponent `scale`: the multiplier is
+// 2^-scale in both directions, so 15, 23 and 31 bring short, 24-bit and int
+// samples to +-1, and -15, -23, -31 take floating samples back. scale 0
+// means no multiplier (and, from floating data, no source limit).
+//
+// Integer to floating: the multiplier is pow(2.0, -scale) in double, narrowed
+// to float for a float destination, then one multiplication in the
+// destination's type. 8-bit samples are unsigned, taken by value (0 to 255),
+// with no scale at all.
+//
+// Floating to integer: the multiplier m is powf(2.0f, -scale) in float. Each
+// source x becomes m if x >= 1, -m if x <= -1, otherwise x * m (a NaN lands
+// there), then round == true rounds halfway cases away from zero (lroundf,
+// independent of the rounding mode), round == false truncates toward zero.
+// NaN and results outside int give -2147483648. The 32-bit result is stored
+// as is in int, wrapped to the low 8 or 16 bits (no limit: at scale -15 a
+// source of +1.0 gives 32768, stored as -32768; at scale -7 both +1.0 and
+// -1.0 give 128 in 8 bits), and saturated only for int24_t.
+//
+// double to int: the same with lround, comparisons against the doubles +-1,
+// m still the float from powf; limited elements are the integers of the
+// float +-m, the others of (double)m * x.
+//
+// int to int24_t: an arithmetic right shift by the low five bits of scale
+// (the opposite sign of the floating exponents), then saturation.
+// int24_t to int: sign extension of bit 23, no shift.
+// float <-> double: plain IEEE conversions, no limit, no scale.
+//
+// These fifteen overloads are the whole set: there is no double to 8, 16 or
+// 24 bits, no 8- or 24-bit to double, and no short <-> int.
+// ---------------------------------------------------------------------------
+KESTACCEL_API void Convert(unsigned int count, const unsigned char* src, float* dst);
+KESTACCEL_API void Convert(unsigned int count, const short* src, float* dst, int scale);
+KESTACCEL_API void Convert(unsigned int count, const short* src, double* dst, int scale);
+KESTACCEL_API void Convert(unsigned int count, const int* src, float* dst, int scale);
+KESTACCEL_API void Convert(unsigned int count, const int* src, double* dst, int scale);
+KESTACCEL_API void Convert(unsigned int count, const int* src, kestcore::utility::int24_t* dst, int scale);
+KESTACCEL_API void Convert(unsigned int count, const float* src, unsigned char* dst, int scale, bool round);
+KESTACCEL_API void Convert(unsigned int count, const float* src, short* dst, int scale, bool round);
+KESTACCEL_API void Convert(unsigned int count, const float* src, int* dst, int scale, bool round);
+KESTACCEL_API void Convert(unsigned int count, const float* src, double* dst);
+KESTACCEL_API void Convert(unsigned int count, const float* src, kestcore::utility::int24_t* dst, int scale, bool round);
+KESTACCEL_API void Convert(unsigned int count, const double* src, int* dst, int scale, bool round);
+KESTACCEL_API void Convert(unsigned int count, const double* src, float* dst);
+KESTACCEL_API void Convert(unsigned int count, const kestcore::utility::int24_t* src, int* dst);
+KESTACCEL_API void Convert(unsigned int count, const kestcore::utility::int24_t* src, float* dst, int scale);
 
 // ---------------------------------------------------------------------------
 // Byte order (SwapBytes).

@@ -1,0 +1,288 @@
+#pragma once
+
+#include <climits>
+#include <cmath>
+#include <cstddef>
+
+#include <kestcore/utility/int24_t.h>
+
+#include "common/FloatToInt.h"
+
+// Sample conversion between integer PCM and floating point.
+//
+// Full scale is reached through a power-of-two exponent: the multiplier is
+// 2^-scale in both directions. Integer to floating takes it from the double
+// pow; floating to integer from the single-precision powf, and limits the
+// source to +-1 before scaling (so a full-scale source becomes exactly +-m,
+// which may wrap in the destination). Every loop is chosen once per call, and
+// its body is made of selects and exact operations only, so that the
+// compiler can vectorise it without changing a bit.
+namespace kestaccel {
+namespace utility {
+namespace cpp {
+
+using kestcore::utility::int24_t;
+
+// ---------------------------------------------------------------------------
+// Integer results of floating values.
+// ---------------------------------------------------------------------------
+
+// Round to nearest, halfway cases away from zero: the in-range results of
+// lroundf. Written out because the library call blocks vectorisation and
+// returns a long, 32 bits on some platforms and 64 on others. trunc(x) and
+// the fraction x - trunc(x) are exact, and the fraction is only compared
+// with 0.5, so the processor's rounding mode has no say. A result outside the
+// range of int, and a NaN, give -2147483648, as truncation does.
+inline int RoundToInt32(float value)
+{
+    const bool inRange = value >= -2147483648.0f && value < 2147483648.0f;
+    const float x = inRange ? value : 0.0f;
+    const int whole = static_cast<int>(x);
+    const float fraction = x - static_cast<float>(whole);
+    const int rounded = whole + (fraction >= 0.5f ? 1 : 0) - (fraction <= -0.5f ? 1 : 0);
+    return inRange ? rounded : INT_MIN;
+}
+
+// The same for lround of a double. Halves at the edges of int round out of
+// range, hence the bounds at +-0.5. The step of one is added in double (an
+// exact sum of small integers) because g++ does not vectorise a double
+// comparison that selects an int.
+inline int RoundToInt32(double value)
+{
+    const bool inRange = value > -2147483648.5 && value < 2147483647.5;
+    const double x = inRange ? value : 0.0;
+    const double whole = static_cast<double>(static_cast<int>(x));
+    const double fraction = x - whole;
+    const double step = (fraction >= 0.5 ? 1.0 : 0.0) - (fraction <= -0.5 ? 1.0 : 0.0);
+    const int rounded = static_cast<int>(whole + step);
+    return inRange ? rounded : INT_MIN;
+}
+
+template <bool kRound, class Real>
+inline int ToInt32(Real value)
+{
+    return kRound ? RoundToInt32(value) : detail::TruncateToInt32(value);
+}
+
+// The store rule of each destination: 8 and 16 bits keep the low bits (a
+// wrap, no limit), 32 bits keep everything, 24 bits saturate through the
+// type's conversion from int.
+template <class Dst>
+inline Dst StoreInt32(int value);
+
+template <>
+inline unsigned char StoreInt32<unsigned char>(int value)
+{
+    return static_cast<unsigned char>(value);
+}
+
+template <>
+inline short StoreInt32<short>(int value)
+{
+    return static_cast<short>(static_cast<unsigned short>(value));
+}
+
+template <>
+inline int StoreInt32<int>(int value)
+{
+    return value;
+}
+
+template <>
+inline int24_t StoreInt32<int24_t>(int value)
+{
+    return int24_t(value);
+}
+
+// The limit on the source: anything at or beyond +-1 becomes exactly +-m; a
+// NaN fails both tests and is scaled like any other value.
+inline float LimitAndScale(float x, float m)
+{
+    return x >= 1.0f ? m : (x <= -1.0f ? -m : x * m);
+}
+
+// 2^-scale for integer sources, from the double pow. The exponent is negated
+// as an integer, wrapping as the hardware does for the lowest int.
+inline double IntegerToRealMultiplier(int scale)
+{
+    const int negated = static_cast<int>(0u - static_cast<unsigned int>(scale));
+    return std::pow(2.0, static_cast<double>(negated));
+}
+
+// 2^-scale for floating sources, from the single-precision powf.
+inline float RealToIntegerMultiplier(int scale)
+{
+    return std::pow(2.0f, 0.0f - static_cast<float>(scale));
+}
+
+// ---------------------------------------------------------------------------
+// Loop bodies, one per path.
+// ---------------------------------------------------------------------------
+
+template <class Src, class Real>
+void IntegerToReal(unsigned int count, const Src* src, Real* dst)
+{
+    for (std::size_t i = 0; i < count; ++i) dst[i] = static_cast<Real>(static_cast<int>(src[i]));
+}
+
+template <class Src, class Real>
+void IntegerToRealScaled(unsigned int count, const Src* src, Real* dst, Real multiplier)
+{
+    for (std::size_t i = 0; i < count; ++i) dst[i] = static_cast<Real>(static_cast<int>(src[i])) * multiplier;
+}
+
+template <class Src, class Real>
+void IntegerToReal(unsigned int count, const Src* src, Real* dst, int scale)
+{
+    if (scale == 0) {
+        IntegerToReal(count, src, dst);
+    } else {
+        const Real multiplier = static_cast<Real>(IntegerToRealMultiplier(scale));
+        IntegerToRealScaled(count, src, dst, multiplier);
+    }
+}
+
+template <bool kRound, class Dst>
+void FloatToIntegerUnscaled(unsigned int count, const float* src, Dst* dst)
+{
+    for (std::size_t i = 0; i < count; ++i) dst[i] = StoreInt32<Dst>(ToInt32<kRound>(src[i]));
+}
+
+template <bool kRound, class Dst>
+void FloatToIntegerScaled(unsigned int count, const float* src, Dst* dst, float m)
+{
+    for (std::size_t i = 0; i < count; ++i) dst[i] = StoreInt32<Dst>(ToInt32<kRound>(LimitAndScale(src[i], m)));
+}
+
+template <class Dst>
+void FloatToInteger(unsigned int count, const float* src, Dst* dst, int scale, bool round)
+{
+    if (scale == 0) {
+        if (round) FloatToIntegerUnscaled<true>(count, src, dst);
+        else FloatToIntegerUnscaled<false>(count, src, dst);
+        return;
+    }
+    const float m = RealToIntegerMultiplier(scale);
+    if (round) FloatToIntegerScaled<true>(count, src, dst, m);
+    else FloatToIntegerScaled<false>(count, src, dst, m);
+}
+
+template <bool kRound>
+void DoubleToInt32Unscaled(unsigned int count, const double* src, int* dst)
+{
+    for (std::size_t i = 0; i < count; ++i) dst[i] = ToInt32<kRound>(src[i]);
+}
+
+// Limited elements take the integer of the float m or -m (lroundf or
+// truncation of the float); elements in range are scaled and converted in
+// double. Both limit results are fixed for the call.
+template <bool kRound>
+void DoubleToInt32Scaled(unsigned int count, const double* src, int* dst, float m)
+{
+    const int high = ToInt32<kRound>(m);
+    const int low = ToInt32<kRound>(-m);
+    const double scale = static_cast<double>(m);
+    for (std::size_t i = 0; i < count; ++i) {
+        const double x = src[i];
+        const int inside = ToInt32<kRound>(scale * x);
+        dst[i] = x >= 1.0 ? high : (x <= -1.0 ? low : inside);
+    }
+}
+
+// ---------------------------------------------------------------------------
+// The Convert overloads.
+// ---------------------------------------------------------------------------
+
+// An 8-bit sample is unsigned and passes by value: no bias, no scale.
+inline void Convert(unsigned int count, const unsigned char* src, float* dst)
+{
+    for (std::size_t i = 0; i < count; ++i) dst[i] = static_cast<float>(src[i]);
+}
+
+inline void Convert(unsigned int count, const short* src, float* dst, int scale)
+{
+    IntegerToReal(count, src, dst, scale);
+}
+
+inline void Convert(unsigned int count, const short* src, double* dst, int scale)
+{
+    IntegerToReal(count, src, dst, scale);
+}
+
+inline void Convert(unsigned int count, const int* src, float* dst, int scale)
+{
+    IntegerToReal(count, src, dst, scale);
+}
+
+inline void Convert(unsigned int count, const int* src, double* dst, int scale)
+{
+    IntegerToReal(count, src, dst, scale);
+}
+
+// Here scale counts right shifts (low five bits), the opposite sign of the
+// floating-to-integer exponent; the arithmetic shift drops bits, so negative
+// samples round toward minus infinity, and the store saturates.
+inline void Convert(unsigned int count, const int* src, int24_t* dst, int scale)
+{
+    const int shift = scale & 31;
+    for (std::size_t i = 0; i < count; ++i) dst[i] = int24_t(src[i] >> shift);
+}
+
+inline void Convert(unsigned int count, const float* src, unsigned char* dst, int scale, bool round)
+{
+    FloatToInteger(count, src, dst, scale, round);
+}
+
+inline void Convert(unsigned int count, const float* src, short* dst, int scale, bool round)
+{
+    FloatToInteger(count, src, dst, scale, round);
+}
+
+inline void Convert(unsigned int count, const float* src, int* dst, int scale, bool round)
+{
+    FloatToInteger(count, src, dst, scale, round);
+}
+
+inline void Convert(unsigned int count, const float* src, double* dst)
+{
+    for (std::size_t i = 0; i < count; ++i) dst[i] = static_cast<double>(src[i]);
+}
+
+inline void Convert(unsigned int count, const float* src, int24_t* dst, int scale, bool round)
+{
+    FloatToInteger(count, src, dst, scale, round);
+}
+
+// The multiplier is still the float from powf; the limit compares doubles.
+inline void Convert(unsigned int count, const double* src, int* dst, int scale, bool round)
+{
+    if (scale == 0) {
+        if (round) DoubleToInt32Unscaled<true>(count, src, dst);
+        else DoubleToInt32Unscaled<false>(count, src, dst);
+        return;
+    }
+    const float m = RealToIntegerMultiplier(scale);
+    if (round) DoubleToInt32Scaled<true>(count, src, dst, m);
+    else DoubleToInt32Scaled<false>(count, src, dst, m);
+}
+
+// One IEEE narrowing under the current rounding mode; overflow gives infinity.
+inline void Convert(unsigned int count, const double* src, float* dst)
+{
+    for (std::size_t i = 0; i < count; ++i) dst[i] = static_cast<float>(src[i]);
+}
+
+// Plain sign extension of bit 23; the value is not shifted up.
+inline void Convert(unsigned int count, const int24_t* src, int* dst)
+{
+    for (std::size_t i = 0; i < count; ++i) dst[i] = static_cast<int>(src[i]);
+}
+
+inline void Convert(unsigned int count, const int24_t* src, float* dst, int scale)
+{
+    IntegerToReal(count, src, dst, scale);
+}
+
+}  // namespace cpp
+}  // namespace utility
+}  // namespace kestaccel
