@@ -1,0 +1,159 @@
+#pragma once
+
+// The state-level operations behind the public FFT entry points: creating
+// and releasing states, and routing each transform to the real or complex
+// kernels of the state's plan.
+
+#include <complex>
+#include <cstdint>
+
+#include "transform/FFT/ComplexKernels.h"
+#include "transform/FFT/FFTStates.h"
+#include "transform/FFT/PlanKernels.h"
+#include "transform/FFT/RealKernels.h"
+#include "utility/BasicMath/LayoutKernels.h"
+#include "utility/VectorUtils/BufferKernels.h"
+
+namespace kestaccel {
+namespace transform {
+namespace cpp {
+
+// The argument is an order, not a length. A null pointer or order 0 leaves
+// the caller's variable as it was; orders act through their low five bits.
+// The plan builder's result is dropped: sizes 1 and 2 simply have no tables.
+template <class State>
+void InitState(State** state, unsigned int order, unsigned int kind)
+{
+    if (state == nullptr || order == 0) return;
+    State* created = new State{};
+    created->order = order;
+    created->size = 1u << (order & 31u);
+    BuildFFTPlan(created->plan, kind, created->size);
+    *state = created;
+}
+
+template <class State>
+void FreeState(State* state)
+{
+    if (state == nullptr) return;
+    DestroyFFTPlan(state->plan);
+    delete state;
+}
+
+inline void FFTInit(FFTState_Float** state, unsigned int order) { InitState(state, order, kRealPlan); }
+inline void FFTInit(FFTState_Double** state, unsigned int order) { InitState(state, order, kRealPlan); }
+inline void FFTInit(FFTState_Complex_Float_Interleaved** state, unsigned int order) { InitState(state, order, kComplexPlan); }
+inline void FFTInit(FFTState_Complex_Double_Interleaved** state, unsigned int order) { InitState(state, order, kComplexPlan); }
+inline void FFTInit(FFTState_Complex_Float_Deinterleaved** state, unsigned int order) { InitState(state, order, kComplexPlan); }
+inline void FFTInit(FFTState_Complex_Double_Deinterleaved** state, unsigned int order) { InitState(state, order, kComplexPlan); }
+
+inline void FFTFree(FFTState_Float* state) { FreeState(state); }
+inline void FFTFree(FFTState_Double* state) { FreeState(state); }
+inline void FFTFree(FFTState_Complex_Float_Interleaved* state) { FreeState(state); }
+inline void FFTFree(FFTState_Complex_Double_Interleaved* state) { FreeState(state); }
+inline void FFTFree(FFTState_Complex_Float_Deinterleaved* state) { FreeState(state); }
+inline void FFTFree(FFTState_Complex_Double_Deinterleaved* state) { FreeState(state); }
+
+// The work lives in the plan's scratch vectors; no caller buffer is needed.
+template <class State>
+void GetBufSize(const State*, unsigned int* bufSize)
+{
+    *bufSize = 0;
+}
+
+inline void FFTGetBufSize(const FFTState_Float* state, unsigned int* bufSize) { GetBufSize(state, bufSize); }
+inline void FFTGetBufSize(const FFTState_Double* state, unsigned int* bufSize) { GetBufSize(state, bufSize); }
+inline void FFTGetBufSize(const FFTState_Complex_Float_Interleaved* state, unsigned int* bufSize) { GetBufSize(state, bufSize); }
+inline void FFTGetBufSize(const FFTState_Complex_Double_Interleaved* state, unsigned int* bufSize) { GetBufSize(state, bufSize); }
+inline void FFTGetBufSize(const FFTState_Complex_Float_Deinterleaved* state, unsigned int* bufSize) { GetBufSize(state, bufSize); }
+inline void FFTGetBufSize(const FFTState_Complex_Double_Deinterleaved* state, unsigned int* bufSize) { GetBufSize(state, bufSize); }
+
+// Interleaved complex: the data is moved into the destination (src == dst is
+// fine) and transformed there, so the state is only read and two threads
+// may share it.
+template <class State, class E>
+void ComplexInterleaved(const std::complex<E>* src, std::complex<E>* dst, const State* state, bool inverse)
+{
+    const E* from = reinterpret_cast<const E*>(src);
+    E* to = reinterpret_cast<E*>(dst);
+    utility::cpp::Move(2 * state->size, from, to);
+    if (inverse) {
+        ComplexFFTInverse(state->plan, to);
+    } else {
+        ComplexFFTForward(state->plan, to);
+    }
+}
+
+// Deinterleaved complex: the destinations stage the input, the pairs are
+// formed in the plan's interleave scratch, transformed, and split back.
+template <class State, class E>
+void ComplexDeinterleaved(const E* srcReal, const E* srcImag, E* dstReal, E* dstImag, State* state, bool inverse)
+{
+    FFTPlan<E>& plan = state->plan;
+    const unsigned int n = plan.size;
+    utility::cpp::Move(n, srcReal, dstReal);
+    utility::cpp::Move(n, srcImag, dstImag);
+    plan.interleaveScratch.Resize(2 * n);
+    E* pairs = plan.interleaveScratch.data();
+    utility::cpp::Interleave(n, dstReal, dstImag, pairs);
+    if (inverse) {
+        ComplexFFTInverse(plan, pairs);
+    } else {
+        ComplexFFTForward(plan, pairs);
+    }
+    utility::cpp::Deinterleave(n, pairs, dstReal, dstImag);
+}
+
+inline void FFTFwd(const float* src, float* dst, FFTState_Float* state, unsigned char*)
+{
+    RealFFTForward(state->plan, src, dst);
+}
+inline void FFTFwd(const double* src, double* dst, FFTState_Double* state, unsigned char*)
+{
+    RealFFTForward(state->plan, src, dst);
+}
+inline void FFTFwd(const std::complex<float>* src, std::complex<float>* dst, FFTState_Complex_Float_Interleaved* state, unsigned char*)
+{
+    ComplexInterleaved(src, dst, state, false);
+}
+inline void FFTFwd(const std::complex<double>* src, std::complex<double>* dst, FFTState_Complex_Double_Interleaved* state, unsigned char*)
+{
+    ComplexInterleaved(src, dst, state, false);
+}
+inline void FFTFwd(const float* srcReal, const float* srcImag, float* dstReal, float* dstImag, FFTState_Complex_Float_Deinterleaved* state, unsigned char*)
+{
+    ComplexDeinterleaved(srcReal, srcImag, dstReal, dstImag, state, false);
+}
+inline void FFTFwd(const double* srcReal, const double* srcImag, double* dstReal, double* dstImag, FFTState_Complex_Double_Deinterleaved* state, unsigned char*)
+{
+    ComplexDeinterleaved(srcReal, srcImag, dstReal, dstImag, state, false);
+}
+
+inline void FFTInv(const float* src, float* dst, FFTState_Float* state, unsigned char*)
+{
+    RealFFTInverse(src, dst, state);
+}
+inline void FFTInv(const double* src, double* dst, FFTState_Double* state, unsigned char*)
+{
+    RealFFTInverse(src, dst, state);
+}
+inline void FFTInv(const std::complex<float>* src, std::complex<float>* dst, FFTState_Complex_Float_Interleaved* state, unsigned char*)
+{
+    ComplexInterleaved(src, dst, state, true);
+}
+inline void FFTInv(const std::complex<double>* src, std::complex<double>* dst, FFTState_Complex_Double_Interleaved* state, unsigned char*)
+{
+    ComplexInterleaved(src, dst, state, true);
+}
+inline void FFTInv(const float* srcReal, const float* srcImag, float* dstReal, float* dstImag, FFTState_Complex_Float_Deinterleaved* state, unsigned char*)
+{
+    ComplexDeinterleaved(srcReal, srcImag, dstReal, dstImag, state, true);
+}
+inline void FFTInv(const double* srcReal, const double* srcImag, double* dstReal, double* dstImag, FFTState_Complex_Double_Deinterleaved* state, unsigned char*)
+{
+    ComplexDeinterleaved(srcReal, srcImag, dstReal, dstImag, state, true);
+}
+
+}  // namespace cpp
+}  // namespace transform
+}  // namespace kestaccel
