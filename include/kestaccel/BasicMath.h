@@ -168,11 +168,104 @@ KESTACCEL_API void DivConstant(unsigned int count, const std::complex<double>* s
 KESTACCEL_API void DivConstant_InPlace(unsigned int count, std::complex<float>* srcDst, std::complex<float> constant);
 KESTACCEL_API void DivConstant_InPlace(unsigned int count, std::complex<double>* srcDst, std::complex<double> constant);
 
-
 // ---------------------------------------------------------------------------
 // Elementwise functions.
 // ---------------------------------------------------------------------------
-// @@section elementwise-functions
+// float and double unless marked.
+//
+//   Sqr, Sqr_InPlace          x * x
+//   Sqrt, Sqrt_InPlace        correctly rounded root; -0 gives -0, a negative
+//                             element the runtime's NaN
+//   Exp, Exp_InPlace          expf / exp
+//   Ln                        logf / log; Ln_InPlace is float only, and
+//                             Ln_Prec11, Ln_Prec21, Ln_Prec24 (float) are Ln
+//   Pow(n, a, b, dst)         powf / pow with a[i] the BASE, b[i] the exponent
+//                             (unlike Sub and Div); Pow_Prec26 (double) is Pow
+//   Inverse                   1 / x by true division; Inverse_Prec26 (double)
+//                             is Inverse
+//   Abs                       -x where 0 > x, else x unchanged: -0 and a
+//                             negative NaN keep their sign bit
+//   Abs_InPlace               clears the sign bit of every element: -0 gives
+//                             +0, a negative NaN a positive one
+//   Round                     nearest, ties away from zero (roundf / round)
+//   Flip                      dst[i] = src[n - 1 - i], a forward copy; with
+//                             dst == src it is not a reversal (use
+//                             Flip_InPlace, which swaps pairs inward)
+//   Magnitude                 hypotf / hypot of (re[i], im[i]), or of the
+//                             parts of a complex element; no overflow between
+//   PowerSpectr               re * re + im * im in the element's type
+//   CartToPolar (float)       src holds (re, im) pairs; magnitude[i] =
+//                             sqrtf(re * re + im * im), which overflows above
+//                             about 1.8e19, phase[i] = atan2f(im, re);
+//                             magnitude must not overlap src
+//   PolarToCart (float)       dst[2i] = cosf(phase[i]) * magnitude[i],
+//                             dst[2i + 1] = sinf(phase[i]) * magnitude[i]
+//   Normalize(n, src, dst, offset, divisor)
+//                             (src[i] - offset) / divisor; no zero test
+//
+// A float member calls the single-precision runtime function, never the
+// double one on a widened value.
+//
+// Invert_Threshold_InPlace(n, srcDst, threshold) replaces each element by its
+// inverse, limited in size to 1 / threshold. Nothing happens when
+// 0 >= threshold. With eps the type's machine epsilon (2^-23, 2^-52):
+//   real, threshold <= eps: x <= eps (every negative x too) gives +inf,
+//     otherwise 1 / x;
+//   real, otherwise: |x| >= threshold gives 1 / x; a smaller x gives
+//     1 / threshold when x > 0 or |x| <= eps, else -1 / threshold (a NaN
+//     too);
+//   complex, p = im * im + re * re: p <= eps (compared in double) gives
+//     (1 / threshold, +0); threshold^2 > p gives (re / m, -im / m) with
+//     m = sqrt(p) * threshold; otherwise (re / p, -im / p).
+
+KESTACCEL_API void Sqr(unsigned int count, const float* src, float* dst);
+KESTACCEL_API void Sqr(unsigned int count, const double* src, double* dst);
+KESTACCEL_API void Sqr_InPlace(unsigned int count, float* srcDst);
+KESTACCEL_API void Sqr_InPlace(unsigned int count, double* srcDst);
+KESTACCEL_API void Sqrt(unsigned int count, const float* src, float* dst);
+KESTACCEL_API void Sqrt(unsigned int count, const double* src, double* dst);
+KESTACCEL_API void Sqrt_InPlace(unsigned int count, float* srcDst);
+KESTACCEL_API void Sqrt_InPlace(unsigned int count, double* srcDst);
+KESTACCEL_API void Exp(unsigned int count, const float* src, float* dst);
+KESTACCEL_API void Exp(unsigned int count, const double* src, double* dst);
+KESTACCEL_API void Exp_InPlace(unsigned int count, float* srcDst);
+KESTACCEL_API void Exp_InPlace(unsigned int count, double* srcDst);
+KESTACCEL_API void Ln(unsigned int count, const float* src, float* dst);
+KESTACCEL_API void Ln(unsigned int count, const double* src, double* dst);
+KESTACCEL_API void Ln_InPlace(unsigned int count, float* srcDst);
+KESTACCEL_API void Ln_Prec11(unsigned int count, const float* src, float* dst);
+KESTACCEL_API void Ln_Prec21(unsigned int count, const float* src, float* dst);
+KESTACCEL_API void Ln_Prec24(unsigned int count, const float* src, float* dst);
+KESTACCEL_API void Pow(unsigned int count, const float* a, const float* b, float* dst);
+KESTACCEL_API void Pow(unsigned int count, const double* a, const double* b, double* dst);
+KESTACCEL_API void Pow_Prec26(unsigned int count, const double* a, const double* b, double* dst);
+KESTACCEL_API void Inverse(unsigned int count, const float* src, float* dst);
+KESTACCEL_API void Inverse(unsigned int count, const double* src, double* dst);
+KESTACCEL_API void Inverse_Prec26(unsigned int count, const double* src, double* dst);
+KESTACCEL_API void Abs(unsigned int count, const float* src, float* dst);
+KESTACCEL_API void Abs(unsigned int count, const double* src, double* dst);
+KESTACCEL_API void Abs_InPlace(unsigned int count, float* srcDst);
+KESTACCEL_API void Abs_InPlace(unsigned int count, double* srcDst);
+KESTACCEL_API void Round(unsigned int count, const float* src, float* dst);
+KESTACCEL_API void Round(unsigned int count, const double* src, double* dst);
+KESTACCEL_API void Flip(unsigned int count, const float* src, float* dst);
+KESTACCEL_API void Flip(unsigned int count, const double* src, double* dst);
+KESTACCEL_API void Flip_InPlace(unsigned int count, float* srcDst);
+KESTACCEL_API void Flip_InPlace(unsigned int count, double* srcDst);
+KESTACCEL_API void Magnitude(unsigned int count, const float* re, const float* im, float* dst);
+KESTACCEL_API void Magnitude(unsigned int count, const double* re, const double* im, double* dst);
+KESTACCEL_API void Magnitude(unsigned int count, const std::complex<float>* src, float* dst);
+KESTACCEL_API void Magnitude(unsigned int count, const std::complex<double>* src, double* dst);
+KESTACCEL_API void PowerSpectr(unsigned int count, const std::complex<float>* src, float* dst);
+KESTACCEL_API void PowerSpectr(unsigned int count, const std::complex<double>* src, double* dst);
+KESTACCEL_API void CartToPolar(unsigned int count, const float* src, float* magnitude, float* phase);
+KESTACCEL_API void PolarToCart(unsigned int count, const float* magnitude, const float* phase, float* dst);
+KESTACCEL_API void Normalize(unsigned int count, const float* src, float* dst, float offset, float divisor);
+KESTACCEL_API void Normalize(unsigned int count, const double* src, double* dst, double offset, double divisor);
+KESTACCEL_API void Invert_Threshold_InPlace(unsigned int count, float* srcDst, float threshold);
+KESTACCEL_API void Invert_Threshold_InPlace(unsigned int count, double* srcDst, double threshold);
+KESTACCEL_API void Invert_Threshold_InPlace(unsigned int count, std::complex<float>* srcDst, float threshold);
+KESTACCEL_API void Invert_Threshold_InPlace(unsigned int count, std::complex<double>* srcDst, double threshold);
 
 // ---------------------------------------------------------------------------
 // Reductions and statistics.
