@@ -376,7 +376,23 @@ KESTACCEL_API void Deinterleave(unsigned int channels, unsigned int frames, cons
 // ---------------------------------------------------------------------------
 // Half precision.
 // ---------------------------------------------------------------------------
-// @@section half-precision
+//
+// Field-moving packing of floats into IEEE binary16 words and back; not an
+// IEEE conversion. Float to half: the sign moves to bit 15, the 8-bit
+// exponent e becomes (e - 112) mod 32, the top ten fraction bits are kept
+// (truncated, never rounded); only +0.0 gives the word 0. So 65536.0 gives
+// 7C00, 131072.0 and 2^-15 give 0000, +inf gives 3C00 (1.0), the quiet NaN
+// 3E00 (1.5), -0.0 gives C000 (-2.0). Half to float: exponent + 112, fraction
+// shifted up, no infinity, NaN or subnormal; only the word 0 gives +0.0
+// (8000 gives -2^-15, 7C00 gives 65536.0). Normal half words come back
+// exactly; floats of normal half range give the correctly rounded word or
+// the one below it in magnitude.
+//
+// The order is source, destination, count, and the source is not const,
+// though it is only read.
+// ---------------------------------------------------------------------------
+KESTACCEL_API void ConvertFloat2Half(float* src, unsigned short* dst, unsigned int count);
+KESTACCEL_API void ConvertHalf2Float(unsigned short* src, float* dst, unsigned int count);
 
 }  // namespace utility
 }  // namespace kestaccel
