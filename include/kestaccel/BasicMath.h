@@ -344,8 +344,42 @@ KESTACCEL_API void MinEvery_InPlace(unsigned int count, const float* src, float*
 
 // ---------------------------------------------------------------------------
 // Thresholds, trimming and ramps.
+//
+// Each element is tested once, strictly; when the test is false (equal to
+// the level, +0 against -0, a NaN element or a NaN level) the element stands
+// with its own bits.
+//
+//   Threshold_LT_InPlace(n, sd, level)          level if level > x, else x
+//   Threshold_GT_InPlace(n, sd, level)          level if level < x, else x
+//   Threshold_LTVal(n, src, dst, level, value)  value if level > x, else x
+//   Threshold_GTVal(n, src, dst, level, value)  value if x > level, else x
+//   (and the _InPlace forms of the two Val members)
+//   Trim(n, sd, low, high)   low if low > x; else high if high < x; else x.
+//                            The low test comes first and wins, so with
+//                            low > high every other element becomes high.
+//                            A NaN low or high disables that side. float only.
+//   VectorSlope(n, dst, offset, slope)   dst[i] = T(i) * slope + offset,
+//                            from the index at each element (no drift);
+//                            the product and the sum round separately.
+//
+// `value` is stored as given, whichever side of the level it lies on.
+// There are no out-of-place LT/GT forms and no double Trim.
 // ---------------------------------------------------------------------------
-// @@section thresholds
+KESTACCEL_API void Threshold_LT_InPlace(unsigned int count, float* srcDst, float level);
+KESTACCEL_API void Threshold_LT_InPlace(unsigned int count, double* srcDst, double level);
+KESTACCEL_API void Threshold_GT_InPlace(unsigned int count, float* srcDst, float level);
+KESTACCEL_API void Threshold_GT_InPlace(unsigned int count, double* srcDst, double level);
+KESTACCEL_API void Threshold_LTVal(unsigned int count, const float* src, float* dst, float level, float value);
+KESTACCEL_API void Threshold_LTVal(unsigned int count, const double* src, double* dst, double level, double value);
+KESTACCEL_API void Threshold_LTVal_InPlace(unsigned int count, float* srcDst, float level, float value);
+KESTACCEL_API void Threshold_LTVal_InPlace(unsigned int count, double* srcDst, double level, double value);
+KESTACCEL_API void Threshold_GTVal(unsigned int count, const float* src, float* dst, float level, float value);
+KESTACCEL_API void Threshold_GTVal(unsigned int count, const double* src, double* dst, double level, double value);
+KESTACCEL_API void Threshold_GTVal_InPlace(unsigned int count, float* srcDst, float level, float value);
+KESTACCEL_API void Threshold_GTVal_InPlace(unsigned int count, double* srcDst, double level, double value);
+KESTACCEL_API void Trim(unsigned int count, float* srcDst, float low, float high);
+KESTACCEL_API void VectorSlope(unsigned int count, float* dst, float offset, float slope);
+KESTACCEL_API void VectorSlope(unsigned int count, double* dst, double offset, double slope);
 
 // ---------------------------------------------------------------------------
 // Channel layout (Interleave, Deinterleave).

@@ -174,6 +174,13 @@ TYPED_TEST(Reductions, NormL1ClearsTheSignOfEveryTerm)
     const std::vector<T> x = {T(-1.5), T(2), -std::numeric_limits<T>::infinity()};
     EXPECT_TRUE(SameBits(T(3.5), ku::NormL1(2u, x.data())));
     EXPECT_TRUE(SameBits(std::numeric_limits<T>::infinity(), ku::NormL1(3u, x.data())));
+    // The sign bit is cleared on a NaN too, so the NaN that comes out is the
+    // positive one with the element's payload.
+    const T negativeNaN = -FromBits<T>(Bits(std::numeric_limits<T>::quiet_NaN()) | 0x9);
+    const T withNaN[] = {T(2), negativeNaN};
+    const T expected = (T(0) + std::fabs(withNaN[0])) + std::fabs(withNaN[1]);
+    ASSERT_NE(Bits(expected), Bits(T(T(0) + withNaN[0]) + withNaN[1])) << "the case must see the sign of the NaN";
+    EXPECT_TRUE(SameBits(expected, ku::NormL1(2u, withNaN)));
 }
 
 TEST(ReductionsFloat, NormL2SquaresInFloatAndSumsInDouble)
