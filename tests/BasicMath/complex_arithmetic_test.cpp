@@ -322,6 +322,13 @@ TYPED_TEST(ComplexArithmetic, HandWorkedValues)
     ku::MulConstant(1, &infinite, &out, unit);
     EXPECT_TRUE(SameBits(inf, out.real()));
     EXPECT_TRUE(std::isnan(out.imag()));
+    // inf - inf * 0 and inf * 0 + inf: both parts NaN, where a recovering
+    // multiply would give (inf, inf).
+    const Z corner(inf, inf);
+    ku::Mul(1, &corner, &unit, &out);
+    EXPECT_TRUE(std::isnan(out.real()) && std::isnan(out.imag()));
+    ku::MulConstant(1, &unit, &out, corner);
+    EXPECT_TRUE(std::isnan(out.real()) && std::isnan(out.imag()));
 
     const Z i(0, 1);
     Z acc(1, 1);
