@@ -374,7 +374,18 @@ TEST(FIRState, WorkBufferSizeIsAlwaysZero)
     }
 }
 
-TEST(FIRState, FreeAcceptsNull) { kf::FIRFree(nullptr); SUCCEED(); }
+// Free gives back every block that Init took, and ignores null.
+TEST(FIRState, FreeReleasesEverythingAndAcceptsNull)
+{
+    const auto taps = RandomReals<float>(12, 44);
+    ResetAllocationTally();
+    FIRState_Float* state = nullptr;
+    kf::FIRInit(&state, taps.data(), 12, nullptr);
+    kf::FIRFree(state);
+    kf::FIRFree(nullptr);
+    const AllocationTally tally = CurrentAllocationTally();
+    EXPECT_EQ(tally.news, tally.deletes);
+}
 
 // ---------------------------------------------------------------------------
 // Impossible tap counts, and allocation.

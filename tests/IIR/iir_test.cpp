@@ -4,6 +4,7 @@
 
 #include <kestaccel/IIR.h>
 
+#include <algorithm>
 #include <cmath>
 #include <cstdint>
 #include <limits>
