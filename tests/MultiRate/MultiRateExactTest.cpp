@@ -141,7 +141,9 @@ TYPED_TEST(MultiRateExact, FewerTapsThanBranchesGivePositiveZeros)
     for (unsigned int tapCount : {0u, 1u, 3u}) {
         SCOPED_TRACE(tapCount);
         const std::vector<T> taps(tapCount, T(-0.5));
-        MultiRateFilter<T> filter(4, 3, taps, 0, 0);
+        // Starting 8 positions back, the first outputs reach into history;
+        // 40 outputs then run through every later path as well.
+        MultiRateFilter<T> filter(4, 3, taps, 8, 0);
         GuardedBuffer<T> out(40, T(7));
         filter.Process(x.data(), out.data(), 10);
         for (std::size_t n = 0; n < 40; ++n) EXPECT_TRUE(SameBits(T(0), out[n])) << "at " << n;
@@ -150,12 +152,14 @@ TYPED_TEST(MultiRateExact, FewerTapsThanBranchesGivePositiveZeros)
 }
 
 // One tap at U = 1: each output is +0 plus the product, so a product of -0
-// comes out as +0.
+// comes out as +0. Thirteen samples: eight side by side, four, then one, with
+// zeros of both signs in each group.
 TYPED_TEST(MultiRateExact, OneTapAddsTheProductToPositiveZero)
 {
     using T = TypeParam;
     const std::vector<T> taps = {T(-1.5)};
-    const std::vector<T> x = {T(0), -T(0), T(2), T(-3), T(1e-30)};
+    const std::vector<T> x = {T(0), -T(0), T(2), T(-3), T(1e-30), T(0), T(5), -T(0),
+                              -T(0), T(0), T(0.25), T(-1), T(0)};
     MultiRateFilter<T> filter(1, 1, taps, 0, 0);
     GuardedBuffer<T> out(x.size());
     filter.Process(x.data(), out.data(), static_cast<unsigned int>(x.size()));
@@ -163,7 +167,7 @@ TYPED_TEST(MultiRateExact, OneTapAddsTheProductToPositiveZero)
         const T expected = T(0) + x[n] * taps[0];
         EXPECT_TRUE(SameBits(expected, out[n])) << "at " << n;
     }
-    EXPECT_TRUE(SameBits(T(0), out[0]));
+    for (std::size_t n : {0, 1, 8, 9, 12}) EXPECT_TRUE(SameBits(T(0), out[n])) << "at " << n;
     EXPECT_TRUE(out.Intact());
 }
 
