@@ -50,11 +50,43 @@ TYPED_TEST(FFTKernelTyped, ComplexMatchesReferenceEveryOrder)
         ComplexFFTForward(plan, actual.data());
         ASSERT_TRUE(SameBitsArray(expected, actual)) << "forward";
 
-        expected = input;
+        auto expectedInverse = input;
         actual = input;
-        fft_reference::Inverse(plan, expected.data());
+        fft_reference::Inverse(plan, expectedInverse.data());
         ComplexFFTInverse(plan, actual.data());
-        ASSERT_TRUE(SameBitsArray(expected, actual)) << "inverse";
+        ASSERT_TRUE(SameBitsArray(expectedInverse, actual)) << "inverse";
+
+        // From a distinct source array, interleaved.
+        std::vector<E> into(2 * n);
+        ForwardInto<E, true>(plan, input.data(), input.data() + 1, into.data(), into.data() + 1);
+        ASSERT_TRUE(SameBitsArray(expected, into)) << "forward into";
+        InverseInto<E, true>(plan, input.data(), input.data() + 1, into.data(), into.data() + 1);
+        ASSERT_TRUE(SameBitsArray(expectedInverse, into)) << "inverse into";
+
+        // Split arrays, from a distinct source and in place.
+        std::vector<E> re(n), im(n), outRe(n), outIm(n);
+        for (unsigned int i = 0; i < n; ++i) {
+            re[i] = input[2 * i];
+            im[i] = input[2 * i + 1];
+        }
+        const auto expectSplit = [&](const std::vector<E>& pairs, const char* what) {
+            for (unsigned int i = 0; i < n; ++i) {
+                ASSERT_TRUE(kestaccel_test::SameBits(pairs[2 * i], outRe[i])) << what << ", real part " << i;
+                ASSERT_TRUE(kestaccel_test::SameBits(pairs[2 * i + 1], outIm[i])) << what << ", imaginary part " << i;
+            }
+        };
+        ForwardInto<E, false>(plan, re.data(), im.data(), outRe.data(), outIm.data());
+        expectSplit(expected, "split forward into");
+        InverseInto<E, false>(plan, re.data(), im.data(), outRe.data(), outIm.data());
+        expectSplit(expectedInverse, "split inverse into");
+        outRe = re;
+        outIm = im;
+        ForwardInPlace<E, false>(plan, outRe.data(), outIm.data());
+        expectSplit(expected, "split forward in place");
+        outRe = re;
+        outIm = im;
+        InverseInPlace<E, false>(plan, outRe.data(), outIm.data());
+        expectSplit(expectedInverse, "split inverse in place");
         DestroyFFTPlan(plan);
     }
 }

@@ -4,6 +4,22 @@
 // on data put in bit-reversed order first. Forward is unscaled with
 // exp(-2 pi i k n / N); the inverse conjugates, runs the forward transform
 // and scales by 1/N.
+//
+// Every butterfly is the radix-2 butterfly of the plain loop nest (twiddle
+// loop outside, strided butterfly loop inside), with the same operands in
+// the same order; only the order in which the independent butterflies of a
+// stage run differs. So the results are the same bits:
+// - stages 1 to 3 run together on each group of 8 points, held in locals;
+// - later stages run in pairs: four points a quarter block apart pass
+//   through both stages before they are stored again;
+// - the butterfly loop runs over consecutive points, so it vectorises.
+// The kernels serve two layouts: interleaved (re, im) pairs, where point k
+// is re[2k], re[2k + 1] and the im pointer is not read (so that g++ sees one
+// interleaved group and vectorises it), and split arrays, where point k is
+// re[k], im[k].
+//
+// The loop kernels are kept out of line: inlined into their caller, g++
+// loses what their restrict parameters promise and leaves them scalar.
 
 #include <cstddef>
 #include <cstdint>
@@ -14,75 +30,385 @@ namespace kestaccel {
 namespace transform {
 namespace cpp {
 
-template <class E>
-void ComplexFFTForward(const FFTPlan<E>& plan, E* a)
+template <bool kPairs>
+struct Layout;
+
+template <>
+struct Layout<true> {
+    static constexpr std::size_t kStep = 2;
+    template <class P>
+    static P& Re(P* re, P*, std::size_t k) { return re[2 * k]; }
+    template <class P>
+    static P& Im(P* re, P*, std::size_t k) { return re[2 * k + 1]; }
+};
+
+template <>
+struct Layout<false> {
+    static constexpr std::size_t kStep = 1;
+    template <class P>
+    static P& Re(P* re, P*, std::size_t k) { return re[k]; }
+    template <class P>
+    static P& Im(P*, P* im, std::size_t k) { return im[k]; }
+};
+
+// The bit-reversal exchanges, walked upwards through the swap table. An
+// entry equal to its index exchanges the point with itself, which changes
+// nothing; doing so unconditionally saves a branch that mispredicts half
+// the time.
+template <class E, bool kPairs>
+void SwapByTable(std::size_t n, const std::uint32_t* __restrict table, E* __restrict re, E* __restrict im)
 {
-    const std::size_t n = plan.size;
-    if (n == 1) return;
+    using L = Layout<kPairs>;
     for (std::size_t i = 0; i + 1 < n; ++i) {
-        const std::size_t p = plan.swapTable[i];
-        if (p != i) {
-            const E re = a[2 * i], im = a[2 * i + 1];
-            a[2 * i] = a[2 * p];
-            a[2 * i + 1] = a[2 * p + 1];
-            a[2 * p] = re;
-            a[2 * p + 1] = im;
+        const std::size_t p = table[i];
+        const E r = L::Re(re, im, i), m = L::Im(re, im, i);
+        L::Re(re, im, i) = L::Re(re, im, p);
+        L::Im(re, im, i) = L::Im(re, im, p);
+        L::Re(re, im, p) = r;
+        L::Im(re, im, p) = m;
+    }
+}
+
+// (x, y) becomes (x + y, x - y).
+template <class E>
+inline void SumDifference(E& xr, E& xi, E& yr, E& yi)
+{
+    const E ar = xr, ai = xi;
+    xr = ar + yr;
+    xi = ai + yi;
+    yr = ar - yr;
+    yi = ai - yi;
+}
+
+// (x, y) becomes (x - i y, x + i y): the butterfly with the factor -i,
+// written without multiplications.
+template <class E>
+inline void MinusIButterfly(E& xr, E& xi, E& yr, E& yi)
+{
+    const E ar = xr, ai = xi, br = yr, bi = yi;
+    xr = ar + bi;
+    xi = ai - br;
+    yr = ar - bi;
+    yi = ai + br;
+}
+
+// (x, y) becomes (x + y w, x - y w), the product formed as
+// (yr wr - yi wi, yr wi + yi wr).
+template <class E>
+inline void Butterfly(E& xr, E& xi, E& yr, E& yi, E wr, E wi)
+{
+    const E tr = yr * wr - yi * wi;
+    const E ti = yr * wi + yi * wr;
+    yr = xr - tr;
+    yi = xi - ti;
+    xr = xr + tr;
+    xi = xi + ti;
+}
+
+// Stages 1 and 2 on each group of 4 points.
+template <class E, bool kPairs>
+[[gnu::noinline]] void StagesOneTwo(std::size_t groups, E* __restrict re, E* __restrict im)
+{
+    using L = Layout<kPairs>;
+    for (std::size_t g = 0; g < groups; ++g) {
+        const std::size_t b = 4 * g;
+        E r[4], m[4];
+        for (std::size_t t = 0; t < 4; ++t) {
+            r[t] = L::Re(re, im, b + t);
+            m[t] = L::Im(re, im, b + t);
         }
-    }
-    for (std::size_t i = 0; i < n; i += 2) {
-        const E xr = a[2 * i], xi = a[2 * i + 1], yr = a[2 * i + 2], yi = a[2 * i + 3];
-        a[2 * i] = xr + yr;
-        a[2 * i + 1] = xi + yi;
-        a[2 * i + 2] = xr - yr;
-        a[2 * i + 3] = xi - yi;
-    }
-    if (plan.order > 1) {
-        for (std::size_t b = 0; b < n; b += 4) {
-            E* q = a + 2 * b;
-            const E ar = q[0], ai = q[1], br = q[4], bi = q[5];
-            q[0] = ar + br;
-            q[1] = ai + bi;
-            q[4] = ar - br;
-            q[5] = ai - bi;
-            // The factor of the second pair is -i.
-            const E xr = q[2], xi = q[3], yr = q[6], yi = q[7];
-            q[2] = xr + yi;
-            q[3] = xi - yr;
-            q[6] = xr - yi;
-            q[7] = xi + yr;
-        }
-    }
-    for (std::uint32_t s = 3; s <= plan.order; ++s) {
-        const std::size_t half = std::size_t(1) << (s - 1);
-        const std::size_t span = half * 2;
-        const std::size_t stride = std::size_t(1) << (plan.order - s);
-        for (std::size_t j = 0; j < half; ++j) {
-            const E wr = plan.twiddles[2 * j * stride], wi = plan.twiddles[2 * j * stride + 1];
-            for (std::size_t i = j; i < n; i += span) {
-                const std::size_t p = i + half;
-                const E tr = a[2 * p] * wr - a[2 * p + 1] * wi;
-                const E ti = a[2 * p] * wi + a[2 * p + 1] * wr;
-                a[2 * p] = a[2 * i] - tr;
-                a[2 * p + 1] = a[2 * i + 1] - ti;
-                a[2 * i] = a[2 * i] + tr;
-                a[2 * i + 1] = a[2 * i + 1] + ti;
-            }
+        SumDifference(r[0], m[0], r[1], m[1]);
+        SumDifference(r[2], m[2], r[3], m[3]);
+        SumDifference(r[0], m[0], r[2], m[2]);
+        MinusIButterfly(r[1], m[1], r[3], m[3]);
+        for (std::size_t t = 0; t < 4; ++t) {
+            L::Re(re, im, b + t) = r[t];
+            L::Im(re, im, b + t) = m[t];
         }
     }
 }
 
+// Stages 1, 2 and 3 on each group of 8 points; w holds the four stage-3
+// factors as (re, im) pairs.
+template <class E, bool kPairs>
+[[gnu::noinline]] void StagesOneToThree(std::size_t groups, E* __restrict re, E* __restrict im, const E* __restrict w)
+{
+    using L = Layout<kPairs>;
+    const E w0r = w[0], w0i = w[1], w1r = w[2], w1i = w[3], w2r = w[4], w2i = w[5], w3r = w[6], w3i = w[7];
+    for (std::size_t g = 0; g < groups; ++g) {
+        const std::size_t b = 8 * g;
+        E r[8], m[8];
+        for (std::size_t t = 0; t < 8; ++t) {
+            r[t] = L::Re(re, im, b + t);
+            m[t] = L::Im(re, im, b + t);
+        }
+        SumDifference(r[0], m[0], r[1], m[1]);
+        SumDifference(r[2], m[2], r[3], m[3]);
+        SumDifference(r[4], m[4], r[5], m[5]);
+        SumDifference(r[6], m[6], r[7], m[7]);
+        SumDifference(r[0], m[0], r[2], m[2]);
+        MinusIButterfly(r[1], m[1], r[3], m[3]);
+        SumDifference(r[4], m[4], r[6], m[6]);
+        MinusIButterfly(r[5], m[5], r[7], m[7]);
+        Butterfly(r[0], m[0], r[4], m[4], w0r, w0i);
+        Butterfly(r[1], m[1], r[5], m[5], w1r, w1i);
+        Butterfly(r[2], m[2], r[6], m[6], w2r, w2i);
+        Butterfly(r[3], m[3], r[7], m[7], w3r, w3i);
+        for (std::size_t t = 0; t < 8; ++t) {
+            L::Re(re, im, b + t) = r[t];
+            L::Im(re, im, b + t) = m[t];
+        }
+    }
+}
+
+// The factors of a stage are gathered from the strided table into small
+// split arrays, a chunk of kChunk butterfly positions at a time, so that
+// every block of the stage reads them contiguously.
+constexpr std::size_t kChunk = 128;
+
 template <class E>
-void ComplexFFTInverse(const FFTPlan<E>& plan, E* a)
+struct FactorChunk {
+    E re[kChunk];
+    E im[kChunk];
+
+    // Pairs first, first + 1, ... of the table at the given stride.
+    void Gather(const E* tw, std::size_t first, std::size_t count, std::size_t stride)
+    {
+        for (std::size_t t = 0; t < count; ++t) {
+            re[t] = tw[2 * (first + t) * stride];
+            im[t] = tw[2 * (first + t) * stride + 1];
+        }
+    }
+};
+
+// One radix-2 stage over `blocks` blocks `span` points apart: in each,
+// point j pairs with point j + half (the second pointer pair), factor j.
+template <class E, bool kPairs>
+[[gnu::noinline]] void StageRun(std::size_t blocks, std::size_t span, std::size_t count, E* __restrict r0,
+                                E* __restrict i0, E* __restrict r1, E* __restrict i1, const E* __restrict wr,
+                                const E* __restrict wi)
+{
+    using L = Layout<kPairs>;
+    for (std::size_t b = 0; b < blocks; ++b) {
+        const std::size_t o = b * span;
+        for (std::size_t j = 0; j < count; ++j) {
+            E xr = L::Re(r0, i0, o + j), xi = L::Im(r0, i0, o + j);
+            E yr = L::Re(r1, i1, o + j), yi = L::Im(r1, i1, o + j);
+            Butterfly(xr, xi, yr, yi, wr[j], wi[j]);
+            L::Re(r0, i0, o + j) = xr;
+            L::Im(r0, i0, o + j) = xi;
+            L::Re(r1, i1, o + j) = yr;
+            L::Im(r1, i1, o + j) = yi;
+        }
+    }
+}
+
+// Two consecutive stages s and s + 1 over blocks of 4q points, q the half
+// span of stage s. Points j, j + q, j + 2q, j + 3q: stage s pairs the first
+// two and the last two with factor a[j]; stage s + 1 then pairs j with
+// j + 2q (factor b[j]) and j + q with j + 3q (factor c[j]).
+template <class E, bool kPairs>
+[[gnu::noinline]] void StagePairRun(std::size_t blocks, std::size_t span, std::size_t count, E* __restrict r0,
+                                    E* __restrict i0, E* __restrict r1, E* __restrict i1, E* __restrict r2,
+                                    E* __restrict i2, E* __restrict r3, E* __restrict i3, const E* __restrict ar_,
+                                    const E* __restrict ai_, const E* __restrict br_, const E* __restrict bi_,
+                                    const E* __restrict cr_, const E* __restrict ci_)
+{
+    using L = Layout<kPairs>;
+    for (std::size_t b = 0; b < blocks; ++b) {
+        const std::size_t o = b * span;
+        for (std::size_t j = 0; j < count; ++j) {
+            const std::size_t k = o + j;
+            E ar = L::Re(r0, i0, k), ai = L::Im(r0, i0, k), br = L::Re(r1, i1, k), bi = L::Im(r1, i1, k);
+            E cr = L::Re(r2, i2, k), ci = L::Im(r2, i2, k), dr = L::Re(r3, i3, k), di = L::Im(r3, i3, k);
+            Butterfly(ar, ai, br, bi, ar_[j], ai_[j]);
+            Butterfly(cr, ci, dr, di, ar_[j], ai_[j]);
+            Butterfly(ar, ai, cr, ci, br_[j], bi_[j]);
+            Butterfly(br, bi, dr, di, cr_[j], ci_[j]);
+            L::Re(r0, i0, k) = ar;
+            L::Im(r0, i0, k) = ai;
+            L::Re(r1, i1, k) = br;
+            L::Im(r1, i1, k) = bi;
+            L::Re(r2, i2, k) = cr;
+            L::Im(r2, i2, k) = ci;
+            L::Re(r3, i3, k) = dr;
+            L::Im(r3, i3, k) = di;
+        }
+    }
+}
+
+// Point k of the layout starts at element k * kStep of both pointers.
+template <bool kPairs>
+constexpr std::size_t Offset(std::size_t k)
+{
+    return k * Layout<kPairs>::kStep;
+}
+
+template <class E, bool kPairs>
+void StagePair(const FFTPlan<E>& plan, std::uint32_t s, E* re, E* im)
+{
+    const std::size_t n = plan.size;
+    const std::size_t q = std::size_t(1) << (s - 1);
+    const std::size_t strideB = std::size_t(1) << (plan.order - s - 1);
+    FactorChunk<E> a, b, c;
+    for (std::size_t j0 = 0; j0 < q; j0 += kChunk) {
+        const std::size_t count = q - j0 < kChunk ? q - j0 : kChunk;
+        a.Gather(plan.twiddles, j0, count, 2 * strideB);
+        b.Gather(plan.twiddles, j0, count, strideB);
+        c.Gather(plan.twiddles, j0 + q, count, strideB);
+        StagePairRun<E, kPairs>(n / (4 * q), 4 * q, count, re + Offset<kPairs>(j0), im + Offset<kPairs>(j0),
+                                re + Offset<kPairs>(j0 + q), im + Offset<kPairs>(j0 + q),
+                                re + Offset<kPairs>(j0 + 2 * q), im + Offset<kPairs>(j0 + 2 * q),
+                                re + Offset<kPairs>(j0 + 3 * q), im + Offset<kPairs>(j0 + 3 * q), a.re, a.im, b.re,
+                                b.im, c.re, c.im);
+    }
+}
+
+// The last stage alone, when the number of stages after the third is odd.
+template <class E, bool kPairs>
+void LastStage(const FFTPlan<E>& plan, E* re, E* im)
+{
+    const std::size_t half = plan.size / 2;
+    FactorChunk<E> w;
+    for (std::size_t j0 = 0; j0 < half; j0 += kChunk) {
+        const std::size_t count = half - j0 < kChunk ? half - j0 : kChunk;
+        w.Gather(plan.twiddles, j0, count, 1);
+        StageRun<E, kPairs>(1, 0, count, re + Offset<kPairs>(j0), im + Offset<kPairs>(j0),
+                            re + Offset<kPairs>(j0 + half), im + Offset<kPairs>(j0 + half), w.re, w.im);
+    }
+}
+
+// The bit-reversal permutation as a copy between distinct arrays, from the
+// swap table alone: walking it downwards and writing both partners of every
+// entry leaves each point at its place, because an entry equal to its index
+// whose partner lies below is rewritten later by that partner's entry. The
+// result is that of a copy followed by the exchanges, without their
+// dependent loads and stores. kConjugate negates the imaginary parts on the
+// way, as the inverse needs. The layouts of source and destination may
+// differ.
+template <class E, bool kSrcPairs, bool kDstPairs, bool kConjugate>
+[[gnu::noinline]] void PermuteInto(std::size_t n, const std::uint32_t* __restrict table, const E* __restrict srcRe,
+                                   const E* __restrict srcIm, E* __restrict dstRe, E* __restrict dstIm)
+{
+    using S = Layout<kSrcPairs>;
+    using D = Layout<kDstPairs>;
+    const auto im = [&](std::size_t k) { return kConjugate ? -S::Im(srcRe, srcIm, k) : S::Im(srcRe, srcIm, k); };
+    D::Re(dstRe, dstIm, n - 1) = S::Re(srcRe, srcIm, n - 1);
+    D::Im(dstRe, dstIm, n - 1) = im(n - 1);
+    for (std::size_t i = n - 1; i-- > 0;) {
+        const std::size_t p = table[i];
+        D::Re(dstRe, dstIm, i) = S::Re(srcRe, srcIm, p);
+        D::Im(dstRe, dstIm, i) = im(p);
+        D::Re(dstRe, dstIm, p) = S::Re(srcRe, srcIm, i);
+        D::Im(dstRe, dstIm, p) = im(i);
+    }
+}
+
+// Everything after the permutation: the stages, on data in bit-reversed
+// order.
+template <class E, bool kPairs>
+void Stages(const FFTPlan<E>& plan, E* re, E* im)
+{
+    const std::size_t n = plan.size;
+    const std::uint32_t order = plan.order;
+    if (order == 1) {
+        SumDifference(Layout<kPairs>::Re(re, im, 0), Layout<kPairs>::Im(re, im, 0), Layout<kPairs>::Re(re, im, 1),
+                      Layout<kPairs>::Im(re, im, 1));
+        return;
+    }
+    if (order == 2) {
+        StagesOneTwo<E, kPairs>(n / 4, re, im);
+        return;
+    }
+    const E* tw = plan.twiddles;
+    const std::size_t stride = std::size_t(1) << (order - 3);
+    const E w[8] = {tw[0], tw[1], tw[2 * stride], tw[2 * stride + 1],
+                    tw[4 * stride], tw[4 * stride + 1], tw[6 * stride], tw[6 * stride + 1]};
+    StagesOneToThree<E, kPairs>(n / 8, re, im, w);
+    std::uint32_t s = 4;
+    for (; s + 1 <= order; s += 2) StagePair<E, kPairs>(plan, s, re, im);
+    if (s == order) LastStage<E, kPairs>(plan, re, im);
+}
+
+template <class E, bool kPairs>
+[[gnu::noinline]] void NegateImaginary(std::size_t n, E* __restrict re, E* __restrict im)
+{
+    using L = Layout<kPairs>;
+    for (std::size_t i = 0; i < n; ++i) L::Im(re, im, i) = -L::Im(re, im, i);
+}
+
+// re times scale, im times -scale: the second product undoes the
+// conjugation and scales in one step.
+template <class E, bool kPairs>
+[[gnu::noinline]] void ScaleConjugate(std::size_t n, E* __restrict re, E* __restrict im, E scale)
+{
+    using L = Layout<kPairs>;
+    const E negScale = -scale;
+    for (std::size_t i = 0; i < n; ++i) {
+        L::Re(re, im, i) = L::Re(re, im, i) * scale;
+        L::Im(re, im, i) = L::Im(re, im, i) * negScale;
+    }
+}
+
+// The transform of `size` points in place; kPairs selects the layout.
+template <class E, bool kPairs>
+void ForwardInPlace(const FFTPlan<E>& plan, E* re, E* im)
+{
+    if (plan.size == 1) return;
+    SwapByTable<E, kPairs>(plan.size, plan.swapTable, re, im);
+    Stages<E, kPairs>(plan, re, im);
+}
+
+template <class E, bool kPairs>
+void InverseInPlace(const FFTPlan<E>& plan, E* re, E* im)
 {
     const std::size_t n = plan.size;
     if (n == 1) return;
     const E scale = E(1) / static_cast<E>(plan.size);
-    for (std::size_t i = 0; i < n; ++i) a[2 * i + 1] = -a[2 * i + 1];
-    ComplexFFTForward(plan, a);
-    for (std::size_t i = 0; i < n; ++i) {
-        a[2 * i] = a[2 * i] * scale;
-        a[2 * i + 1] = a[2 * i + 1] * -scale;
+    NegateImaginary<E, kPairs>(n, re, im);
+    ForwardInPlace<E, kPairs>(plan, re, im);
+    ScaleConjugate<E, kPairs>(n, re, im, scale);
+}
+
+// The same transforms from a source array into a distinct destination of
+// the same layout: the same bits as copying first and transforming in place.
+template <class E, bool kPairs>
+void ForwardInto(const FFTPlan<E>& plan, const E* srcRe, const E* srcIm, E* re, E* im)
+{
+    if (plan.size == 1) {
+        Layout<kPairs>::Re(re, im, 0) = Layout<kPairs>::Re(srcRe, srcIm, 0);
+        Layout<kPairs>::Im(re, im, 0) = Layout<kPairs>::Im(srcRe, srcIm, 0);
+        return;
     }
+    PermuteInto<E, kPairs, kPairs, false>(plan.size, plan.swapTable, srcRe, srcIm, re, im);
+    Stages<E, kPairs>(plan, re, im);
+}
+
+template <class E, bool kPairs>
+void InverseInto(const FFTPlan<E>& plan, const E* srcRe, const E* srcIm, E* re, E* im)
+{
+    const std::size_t n = plan.size;
+    if (n == 1) {
+        ForwardInto<E, kPairs>(plan, srcRe, srcIm, re, im);
+        return;
+    }
+    const E scale = E(1) / static_cast<E>(plan.size);
+    PermuteInto<E, kPairs, kPairs, true>(n, plan.swapTable, srcRe, srcIm, re, im);
+    Stages<E, kPairs>(plan, re, im);
+    ScaleConjugate<E, kPairs>(n, re, im, scale);
+}
+
+// Interleaved (re, im) pairs, size of them, in place.
+template <class E>
+void ComplexFFTForward(const FFTPlan<E>& plan, E* pairs)
+{
+    ForwardInPlace<E, true>(plan, pairs, pairs + 1);
+}
+
+template <class E>
+void ComplexFFTInverse(const FFTPlan<E>& plan, E* pairs)
+{
+    InverseInPlace<E, true>(plan, pairs, pairs + 1);
 }
 
 }  // namespace cpp

@@ -5,13 +5,13 @@
 // kernels of the state's plan.
 
 #include <complex>
+#include <cstddef>
 #include <cstdint>
 
 #include "transform/FFT/ComplexKernels.h"
 #include "transform/FFT/FFTStates.h"
 #include "transform/FFT/PlanKernels.h"
 #include "transform/FFT/RealKernels.h"
-#include "utility/BasicMath/LayoutKernels.h"
 #include "utility/VectorUtils/BufferKernels.h"
 
 namespace kestaccel {
@@ -68,40 +68,70 @@ inline void FFTGetBufSize(const FFTState_Complex_Double_Interleaved* state, unsi
 inline void FFTGetBufSize(const FFTState_Complex_Float_Deinterleaved* state, unsigned int* bufSize) { GetBufSize(state, bufSize); }
 inline void FFTGetBufSize(const FFTState_Complex_Double_Deinterleaved* state, unsigned int* bufSize) { GetBufSize(state, bufSize); }
 
-// Interleaved complex: the data is moved into the destination (src == dst is
-// fine) and transformed there, so the state is only read and two threads
-// may share it.
+// Whether two arrays of `count` elements share any element. Compared as
+// integers: the arrays may be unrelated objects.
+template <class E>
+bool Overlap(const E* a, const E* b, std::size_t count)
+{
+    const auto x = reinterpret_cast<std::uintptr_t>(a), y = reinterpret_cast<std::uintptr_t>(b);
+    const std::uintptr_t bytes = count * sizeof(E);
+    return x < y + bytes && y < x + bytes;
+}
+
+// Interleaved complex: the result is that of moving the data into the
+// destination (src == dst is fine) and transforming it there, so the state
+// is only read and two threads may share it. Distinct arrays take the
+// permuted copy instead of the move and the exchanges.
 template <class State, class E>
 void ComplexInterleaved(const std::complex<E>* src, std::complex<E>* dst, const State* state, bool inverse)
 {
+    const FFTPlan<E>& plan = state->plan;
     const E* from = reinterpret_cast<const E*>(src);
     E* to = reinterpret_cast<E*>(dst);
-    utility::cpp::Move(2 * state->size, from, to);
+    const unsigned int count = 2 * state->size;
+    if (!Overlap(from, to, count)) {
+        if (inverse) {
+            InverseInto<E, true>(plan, from, from + 1, to, to + 1);
+        } else {
+            ForwardInto<E, true>(plan, from, from + 1, to, to + 1);
+        }
+        return;
+    }
+    utility::cpp::Move(count, from, to);
     if (inverse) {
-        ComplexFFTInverse(state->plan, to);
+        ComplexFFTInverse(plan, to);
     } else {
-        ComplexFFTForward(state->plan, to);
+        ComplexFFTForward(plan, to);
     }
 }
 
-// Deinterleaved complex: the destinations stage the input, the pairs are
-// formed in the plan's interleave scratch, transformed, and split back.
+// Deinterleaved complex: the result is that of staging the input in the
+// destinations, pairing it up, transforming the pairs and splitting them
+// back. The transform runs on the split arrays directly, which gives the
+// same bits without the two copies; when no source overlaps a destination,
+// the permutation also serves as the staging copy.
 template <class State, class E>
 void ComplexDeinterleaved(const E* srcReal, const E* srcImag, E* dstReal, E* dstImag, State* state, bool inverse)
 {
-    FFTPlan<E>& plan = state->plan;
+    const FFTPlan<E>& plan = state->plan;
     const unsigned int n = plan.size;
+    const bool distinct = !Overlap(srcReal, dstReal, n) && !Overlap(srcReal, dstImag, n) &&
+                          !Overlap(srcImag, dstReal, n) && !Overlap(srcImag, dstImag, n);
+    if (distinct) {
+        if (inverse) {
+            InverseInto<E, false>(plan, srcReal, srcImag, dstReal, dstImag);
+        } else {
+            ForwardInto<E, false>(plan, srcReal, srcImag, dstReal, dstImag);
+        }
+        return;
+    }
     utility::cpp::Move(n, srcReal, dstReal);
     utility::cpp::Move(n, srcImag, dstImag);
-    plan.interleaveScratch.Resize(2 * n);
-    E* pairs = plan.interleaveScratch.data();
-    utility::cpp::Interleave(n, dstReal, dstImag, pairs);
     if (inverse) {
-        ComplexFFTInverse(plan, pairs);
+        InverseInPlace<E, false>(plan, dstReal, dstImag);
     } else {
-        ComplexFFTForward(plan, pairs);
+        ForwardInPlace<E, false>(plan, dstReal, dstImag);
     }
-    utility::cpp::Deinterleave(n, pairs, dstReal, dstImag);
 }
 
 inline void FFTFwd(const float* src, float* dst, FFTState_Float* state, unsigned char*)

@@ -11,11 +11,38 @@
 
 #include "transform/FFT/ComplexKernels.h"
 #include "transform/FFT/FFTPlan.h"
-#include "utility/VectorUtils/BufferKernels.h"
 
 namespace kestaccel {
 namespace transform {
 namespace cpp {
+
+// Splits the half-size spectrum Z (split arrays) into the spectra of the
+// even samples e and the odd samples o, and combines them into the packed
+// spectrum X[k] = e[k] + w^k o[k]. Bins k and H - k come from the same pair
+// Z[k], Z[H - k]: the upper bin takes the conjugates of the lower bin's e and
+// o, so every value is formed by the same operations as when the split is
+// stored first and the combine runs over it afterwards.
+template <class E>
+[[gnu::noinline]] void SplitCombine(std::size_t h, const E* __restrict zr, const E* __restrict zi,
+                                    const E* __restrict w, E* __restrict dst)
+{
+    const std::size_t q = h / 2;
+    for (std::size_t k = 1; k < q; ++k) {
+        const std::size_t j = h - k;
+        const E ar = zr[k], ai = zi[k], br = zr[j], bi = zi[j];
+        const E oRe = (ai + bi) * E(0.5);
+        const E oIm = (ar - br) * E(-0.5);
+        const E eRe = (br + ar) * E(0.5);
+        const E eIm = (ai - bi) * E(0.5);
+        const E wr = w[2 * (k - 1)], wi = w[2 * (k - 1) + 1];
+        dst[2 * k] = (wr * oRe + eRe) - oIm * wi;
+        dst[2 * k + 1] = (oRe * wi + eIm) + wr * oIm;
+        const E vr = w[2 * (j - 1)], vi = w[2 * (j - 1) + 1];
+        const E cRe = -oIm, cIm = -eIm;
+        dst[2 * j] = (vr * oRe + eRe) - cRe * vi;
+        dst[2 * j + 1] = (oRe * vi + cIm) + vr * cRe;
+    }
+}
 
 template <class E>
 void RealFFTForward(FFTPlan<E>& plan, const E* src, E* dst)
@@ -35,49 +62,29 @@ void RealFFTForward(FFTPlan<E>& plan, const E* src, E* dst)
         return;
     }
     const std::size_t h = n / 2, q = n / 4;
+    // The samples, seen as H pairs, go into the scratch as split arrays in
+    // bit-reversed order; the complex transform of H points runs there.
     plan.forwardScratch.Resize(2 * plan.size + 2);
-    E* s = plan.forwardScratch.data();
-    if (src != s) utility::cpp::Copy(plan.size, src, s);
-    ComplexFFTForward(*plan.halfPlan, s);
-
-    // Split Z into the spectra of the even (e) and odd (o) samples. The
-    // conjugates go to the mirrored bins so that the combine loop below
-    // needs no case for the upper half.
-    for (std::size_t k = 1; k < q; ++k) {
-        const std::size_t j = h - k;
-        const E ar = s[2 * k], ai = s[2 * k + 1], br = s[2 * j], bi = s[2 * j + 1];
-        const E oRe = (ai + bi) * E(0.5);
-        const E oIm = (ar - br) * E(-0.5);
-        const E eRe = (br + ar) * E(0.5);
-        const E eIm = (ai - bi) * E(0.5);
-        s[2 * (h + k)] = oRe;
-        s[2 * (h + k) + 1] = oIm;
-        s[2 * (2 * h - k)] = oRe;
-        s[2 * (2 * h - k) + 1] = -oIm;
-        s[2 * k] = eRe;
-        s[2 * k + 1] = eIm;
-        s[2 * j] = eRe;
-        s[2 * j + 1] = -eIm;
-    }
-    s[2 * (h + q)] = s[2 * q + 1];
-    s[2 * (h + q) + 1] = E(0);
-    s[2 * q + 1] = E(0);
-
-    const E z0Re = s[0], z0Im = s[1];
-    s[2 * h] = z0Re - z0Im;
-    s[2 * h + 1] = E(0) - E(0);
-    s[0] = z0Re + z0Im;
-    s[1] = E(0) + E(0);
+    E* zr = plan.forwardScratch.data();
+    E* zi = zr + h;
+    const FFTPlan<E>& half = *plan.halfPlan;
+    PermuteInto<E, true, false, false>(h, half.swapTable, src, src + 1, zr, zi);
+    Stages<E, false>(half, zr, zi);
 
     const E* w = plan.twiddles;
-    for (std::size_t k = 1; k < h; ++k) {
-        const E wr = w[2 * (k - 1)], wi = w[2 * (k - 1) + 1];
-        const E oRe = s[2 * (h + k)], oIm = s[2 * (h + k) + 1];
-        const E eRe = s[2 * k], eIm = s[2 * k + 1];
-        s[2 * k] = (wr * oRe + eRe) - oIm * wi;
-        s[2 * k + 1] = (oRe * wi + eIm) + wr * oIm;
-    }
-    utility::cpp::Copy(plan.size + 2, s, dst);
+    SplitCombine(h, zr, zi, w, dst);
+    // The middle bin has o = (Z[Q].im, 0) and e = (Z[Q].re, 0).
+    const E oRe = zi[q], eRe = zr[q], oIm = E(0), eIm = E(0);
+    const E wr = w[2 * (q - 1)], wi = w[2 * (q - 1) + 1];
+    dst[2 * q] = (wr * oRe + eRe) - oIm * wi;
+    dst[2 * q + 1] = (oRe * wi + eIm) + wr * oIm;
+    // DC and Nyquist: Z[0].re plus and minus Z[0].im, with zero imaginary
+    // parts formed as 0 + 0 and 0 - 0.
+    const E z0Re = zr[0], z0Im = zi[0];
+    dst[2 * h] = z0Re - z0Im;
+    dst[2 * h + 1] = E(0) - E(0);
+    dst[0] = z0Re + z0Im;
+    dst[1] = E(0) + E(0);
 }
 
 // State is FFTState_Float or FFTState_Double; its plan is a real plan.
