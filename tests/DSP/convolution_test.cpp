@@ -71,6 +71,29 @@ TYPED_TEST(ConvolveTyped, MatchesOneOutputAtATimeBitForBit)
     }
 }
 
+// Every pair of small counts: both array orders, counts below, at and
+// just past any grouping of terms, and every remainder.
+TYPED_TEST(ConvolveTyped, SmallCountsMatchBitForBit)
+{
+    using T = TypeParam;
+    for (unsigned int countA = 1; countA <= 19; ++countA) {
+        for (unsigned int countB = 1; countB <= 19; ++countB) {
+            const std::uint32_t seed = 2500 + 100 * countA + countB;
+            SCOPED_TRACE(SeedTrace(seed));
+            // Magnitudes spread widely, so that any other order of a sum
+            // shows in its rounding.
+            auto a = RandomReals<T>(countA, seed);
+            auto b = RandomReals<T>(countB, seed + 1);
+            for (std::size_t i = 0; i < a.size(); i += 2) a[i] *= T(4096);
+            const auto expected = PlainConvolve(a, b);
+            GuardedBuffer<T> dst(expected.size(), std::numeric_limits<T>::quiet_NaN());
+            ku::Convolve(countA, a.data(), countB, b.data(), dst.data());
+            ASSERT_TRUE(SameBitsArray(expected, dst.values())) << countA << " by " << countB;
+            ASSERT_TRUE(dst.Intact()) << countA << " by " << countB;
+        }
+    }
+}
+
 // Operands spread over many magnitudes make the rounding depend on the
 // order of summation, so swapping the arrays changes the bits while the
 // library still matches the loop over the first array.
