@@ -11,6 +11,7 @@
 #include <complex>
 #include <cstdint>
 #include <limits>
+#include <new>
 #include <vector>
 
 #include "support/TestSupport.h"
@@ -212,6 +213,17 @@ TYPED_TEST(MultiplyTyped, WorkedRowMajorExample)
     const T expectedCol[] = {T(1), T(2), T(9), T(12)};
     Multiply(kestaccel::ColMajor, 2, 2, 3, a, b, c.data());
     EXPECT_TRUE(SameBitsArray(expectedCol, c.data(), 4));
+}
+
+// A temporary that cannot be allocated (2^60 elements) throws before c is
+// touched, and before either operand is read past its first element.
+TEST(Multiply, FailedTemporaryThrowsBadAllocAndLeavesOutput)
+{
+    const float a[1] = {1.0f}, b[1] = {2.0f};
+    GuardedBuffer<float> c(1, 7.0f);
+    EXPECT_THROW(Multiply(kestaccel::RowMajor, 1 << 30, 1 << 30, 1, a, b, c.data()), std::bad_alloc);
+    EXPECT_TRUE(SameBits(7.0f, c[0]));
+    EXPECT_TRUE(c.Intact());
 }
 
 // Complex operands are neither conjugated nor transposed.
