@@ -26,3 +26,8 @@ set(KESTACCEL_KERNEL_OPT_FLAGS "")
 if(NOT MSVC)
     set(KESTACCEL_KERNEL_OPT_FLAGS -O3)
 endif()
+
+# MinGW's <cmath> hides M_PI and friends in strict C++ mode; glibc shows them.
+if(WIN32)
+    target_compile_definitions(kestaccel_fp_flags INTERFACE _USE_MATH_DEFINES)
+endif()

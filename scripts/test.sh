@@ -3,8 +3,10 @@
 #   1. the release build (tests, export check, installed-consumer check);
 #   2. the same suite under AddressSanitizer and UndefinedBehaviorSanitizer;
 #   3. the bit-exact tests of a build for x86-64-v3, which must give the same
-#      bits as the baseline build.
-# Set KESTACCEL_QUICK=1 to run only the first.
+#      bits as the baseline build;
+#   4. the whole suite cross-built for 64-bit Windows and run under Wine.
+# Set KESTACCEL_QUICK=1 to run only the first; KESTACCEL_SKIP_WINDOWS=1 skips
+# the fourth.
 set -euo pipefail
 cd "$(dirname "$0")/.."
 
@@ -37,3 +39,8 @@ cmake -S . -B build-v3 -DCMAKE_BUILD_TYPE=Release -DKESTACCEL_ISA=x86-64-v3 "-DC
     -DKESTACCEL_BUILD_BENCHMARKS=OFF -DKESTACCEL_BUILD_EXAMPLES=OFF -DKESTACCEL_INSTALL=OFF
 cmake --build build-v3 -j "$jobs"
 ctest --test-dir build-v3 --output-on-failure --timeout 600 -j "$jobs" -L bitexact
+
+if [ "${KESTACCEL_SKIP_WINDOWS:-0}" != 1 ]; then
+    step "Windows build (MinGW-w64), tests under Wine"
+    scripts/test-windows.sh
+fi

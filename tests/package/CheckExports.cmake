@@ -1,3 +1,5 @@
+cmake_minimum_required(VERSION 3.16)
+
 # Every defined dynamic symbol of the shared library must belong to one of
 # the three public namespaces, and no kernel of a cpp namespace may appear.
 execute_process(COMMAND ${NM} -DC --defined-only ${LIBRARY}

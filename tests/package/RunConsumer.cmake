@@ -1,3 +1,5 @@
+cmake_minimum_required(VERSION 3.16)
+
 # Installs the build tree into a scratch prefix, then configures, builds and
 # runs the small consumer project against it through find_package.
 set(prefix ${WORK_DIR}/prefix)
@@ -18,8 +20,10 @@ if(CONFIG)
 endif()
 run(${CMAKE_COMMAND} --install ${BUILD_DIR} --prefix ${prefix} ${config_args})
 
+# kestaccel_DIR is given as well as the prefix: a cross toolchain confines
+# package searches to its own root.
 set(configure_args -S ${CONSUMER_SOURCE} -B ${consumer_build} -G ${GENERATOR}
-    -DCMAKE_PREFIX_PATH=${prefix} -DCMAKE_BUILD_TYPE=Release)
+    -DCMAKE_PREFIX_PATH=${prefix} -Dkestaccel_DIR=${prefix}/lib/cmake/kestaccel -DCMAKE_BUILD_TYPE=Release)
 if(TOOLCHAIN)
     list(APPEND configure_args -DCMAKE_TOOLCHAIN_FILE=${TOOLCHAIN})
 endif()
