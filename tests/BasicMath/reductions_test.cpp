@@ -435,8 +435,9 @@ TEST(ScansFloat, IndexScansMatchThePositionScanAndCopyBits)
     }
 }
 
-// The paired scan written out: pairs from `start`, the smaller of a pair
-// against the minimum, the larger against the maximum with the inverted test.
+// The paired scan written out step by step: pairs from `start`, the smaller
+// of a pair against the minimum, the larger against the maximum with the
+// inverted test, a last single element on its own.
 struct Pair {
     std::size_t lo;
     std::size_t hi;
@@ -444,8 +445,7 @@ struct Pair {
 
 Pair LoopPairedScan(const std::vector<float>& x, std::size_t n, std::size_t start, Pair s)
 {
-    std::size_t i = start;
-    while (i < n) {
+    for (std::size_t i = start; i < n; i += 2) {
         if (i == n - 1) {
             if (x[s.lo] > x[i])
                 s.lo = i;
@@ -453,11 +453,14 @@ Pair LoopPairedScan(const std::vector<float>& x, std::size_t n, std::size_t star
                 s.hi = i;
             break;
         }
-        const std::size_t small = x[i] > x[i + 1] ? i + 1 : i;
-        const std::size_t large = x[i] > x[i + 1] ? i : i + 1;
-        if (x[s.lo] > x[small]) s.lo = small;
-        if (!(x[s.hi] > x[large])) s.hi = large;
-        i += 2;
+        const std::size_t p = i, q = i + 1;
+        if (x[p] > x[q]) {
+            if (x[s.lo] > x[q]) s.lo = q;
+            if (!(x[s.hi] > x[p])) s.hi = p;
+        } else {
+            if (x[s.lo] > x[p]) s.lo = p;
+            if (!(x[s.hi] > x[q])) s.hi = q;
+        }
     }
     return s;
 }
@@ -550,6 +553,12 @@ TEST(ScansFloat, MinMaxIndexAndMinMaxMatchThePairedScan)
         ku::MinMax(n, x.data(), mn2, mx2);
         EXPECT_TRUE(SameBits(x[s.lo], mn2));
         EXPECT_TRUE(SameBits(x[s.hi], mx2));
+
+        const auto y = RandomReals<float>(n, seed++);
+        const Pair t = LoopPairedScan(y, n, 1, {0, 0});
+        ku::MinMaxIndex(n, y.data(), mn, mx, iMin, iMax);
+        EXPECT_EQ(t.lo, iMin);
+        EXPECT_EQ(t.hi, iMax);
     }
 }
 

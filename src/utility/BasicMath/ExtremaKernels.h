@@ -62,25 +62,36 @@ inline unsigned int MinIndex(unsigned int count, const float* src, float* value)
 // maximum. The maximum test is inverted ("not current > candidate"), so an
 // element equal to the maximum moves it on: `lo` ends at the first of the
 // smallest elements and `hi` at the last of the largest.
+//
+// The order within a pair is random on real data, so it becomes an index
+// offset rather than a branch; the tests against the running extremes
+// rarely fire and stay branches. The extremes' values are kept beside their
+// positions; they are copies of src[lo] and src[hi], so every comparison is
+// the one made on the elements themselves.
 inline void PairedScan(unsigned int count, const float* src, std::size_t start, std::size_t& lo, std::size_t& hi)
 {
-    for (std::size_t i = start; i < count; i += 2) {
-        if (i + 1 == count) {
-            if (src[lo] > src[i])
-                lo = i;
-            else if (!(src[hi] > src[i]))
-                hi = i;
-            return;
+    float loValue = src[lo];
+    float hiValue = src[hi];
+    std::size_t i = start;
+    for (; i + 1 < count; i += 2) {
+        const std::size_t smaller = i + (src[i] > src[i + 1] ? 1 : 0);
+        const std::size_t larger = (2 * i + 1) - smaller;
+        if (loValue > src[smaller]) {
+            lo = smaller;
+            loValue = src[smaller];
         }
-        const std::size_t p = i;
-        const std::size_t q = i + 1;
-        if (src[p] > src[q]) {
-            if (src[lo] > src[q]) lo = q;
-            if (!(src[hi] > src[p])) hi = p;
-        } else {
-            if (src[lo] > src[p]) lo = p;
-            if (!(src[hi] > src[q])) hi = q;
+        if (!(hiValue > src[larger])) {
+            hi = larger;
+            hiValue = src[larger];
         }
+    }
+    // A last single element: the maximum is tested only when the minimum
+    // test fails.
+    if (i + 1 == count) {
+        if (loValue > src[i])
+            lo = i;
+        else if (!(hiValue > src[i]))
+            hi = i;
     }
 }
 
