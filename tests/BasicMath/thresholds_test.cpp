@@ -345,4 +345,22 @@ TEST(VectorSlopeFloat, NoDriftAndNoFusedStep)
     EXPECT_TRUE(fusedSeen);
 }
 
+TEST(VectorSlopeFloat, IndexAbove2To24IsRoundedToFloat)
+{
+    // 64 MiB, once: the only way to reach indices that float cannot hold.
+    const unsigned int n = (1u << 24) + 33u;
+    const float slope = 1.0f + std::ldexp(1.0f, -20), offset = -0.75f;
+    std::vector<float> dst(n);
+    ku::VectorSlope(n, dst.data(), offset, slope);
+    bool widerIndexSeen = false;
+    for (unsigned int i = (1u << 24) - 8u; i < n; ++i) {
+        const float index = static_cast<float>(i);
+        const float product = index * slope;
+        EXPECT_TRUE(SameBits(product + offset, dst[i])) << "index " << i;
+        const float wide = static_cast<float>(static_cast<double>(i) * slope) + offset;
+        widerIndexSeen = widerIndexSeen || Bits(wide) != Bits(dst[i]);
+    }
+    EXPECT_TRUE(widerIndexSeen) << "the range must tell a wider index apart";
+}
+
 }  // namespace
