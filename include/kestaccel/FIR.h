@@ -61,9 +61,11 @@ KESTACCEL_API void FIRFree(FIRState_Float* state);
 // odd counts, between the two middle taps for even ones, x advancing by pi
 // per tap), then multiplied in place by the window windowType selects:
 // kDSPWindowBartlett, kDSPWindowHamming or kDSPWindowHann; any other value,
-// 1 included, applies none. With normalize, the taps are scaled by
-// 1 / (2 |sum of the left half| + centre tap), so that their sum is 1, or -1
-// when the left half sums to a negative value; a zero sum gives NaN taps.
+// 1 included, applies none. With normalize, every tap is multiplied by
+// 1 / (2 |S| + centre), where S is the sum of the left half without the
+// centre (the right half is taken to equal it) and centre is the middle tap
+// of an odd count, 0 for an even one: a positive S scales the sum to 1, a
+// negative one keeps its sign, and a zero one (cutoff 0) gives NaN taps.
 // workBuffer is never read or written and may be null.
 KESTACCEL_API void GenerateLowpassFIRCoefficients(double cutoff, unsigned int tapCount, double* taps,
                                                   utility::DSPWindowType windowType, bool normalize,
