@@ -30,3 +30,15 @@ if(NOT MSVC)
     set_source_files_properties(${CMAKE_CURRENT_SOURCE_DIR}/filter/MultiRate/MultiRate.cpp
         PROPERTIES COMPILE_OPTIONS "-O2")
 endif()
+
+# Complex arithmetic: the quotient computes both forms of Smith's method and
+# selects one, so that the divide loops can run several elements at once.
+# Under the default trapping-math rules g++ sinks each form's divisions back
+# into a branch (a division might raise a flag the other form would not
+# have) and the loops stay scalar. No flag is read and no trap is enabled
+# here, so -fno-trapping-math changes no bit; the complex tests compare the
+# divide members with the plain steps of the method, element by element.
+if(NOT MSVC)
+    set_source_files_properties(${CMAKE_CURRENT_SOURCE_DIR}/utility/BasicMath/ComplexArithmetic.cpp
+        PROPERTIES COMPILE_OPTIONS "-fno-trapping-math")
+endif()

@@ -195,10 +195,15 @@ void AddProduct(unsigned int count, const std::complex<T>* a, const std::complex
 template <class T>
 void Div(unsigned int count, const std::complex<T>* a, const std::complex<T>* b, std::complex<T>* dst)
 {
+    const T* v = detail::Components(a);
+    const T* u = detail::Components(b);
+    T* out = detail::Components(dst);
     for (std::size_t i = 0; i < count; ++i) {
-        const std::complex<T> v = a[i];
-        const std::complex<T> u = b[i];
-        dst[i] = Quotient(u.real(), u.imag(), v.real(), v.imag());
+        const T vr = v[2 * i], vi = v[2 * i + 1];
+        const T ur = u[2 * i], ui = u[2 * i + 1];
+        const std::complex<T> q = Quotient(ur, ui, vr, vi);
+        out[2 * i] = q.real();
+        out[2 * i + 1] = q.imag();
     }
 }
 
@@ -221,10 +226,14 @@ template <class T>
 void DivConstant(unsigned int count, const std::complex<T>* src, std::complex<T>* dst, std::complex<T> constant)
 {
     if (IsZeroDivisor(constant)) return;
-    const T vr = constant.real(), vi = constant.imag();
+    const ScaledDivisor<T> v = ScaleDivisor(constant.real(), constant.imag());
+    const T* u = detail::Components(src);
+    T* out = detail::Components(dst);
     for (std::size_t i = 0; i < count; ++i) {
-        const std::complex<T> u = src[i];
-        dst[i] = Quotient(u.real(), u.imag(), vr, vi);
+        const T ur = u[2 * i], ui = u[2 * i + 1];
+        const std::complex<T> q = Divide(ur, ui, v);
+        out[2 * i] = q.real();
+        out[2 * i + 1] = q.imag();
     }
 }
 

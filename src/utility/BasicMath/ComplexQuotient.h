@@ -27,26 +27,56 @@ inline T DefaultNaN()
     return value;
 }
 
-// u / v. Only the denominator is tested; a NaN in the numerator travels
-// through the arithmetic. Equal magnitudes take the second branch, and every
-// operation is rounded to T in the order written.
+// u / v by Smith's method. Only the denominator is tested; a NaN in the
+// numerator travels through the arithmetic. Every operation is rounded to T
+// in the order of the method:
+//
+//   |vr| > |vi|:  w = vi / vr, d = vr + w * vi,
+//                 ((ur + ui * w) / d, (ui - ur * w) / d)
+//   otherwise:    w = vr / vi, d = vi + w * vr,
+//                 ((ur * w + ui) / d, (ui * w - ur) / d)
+//
+// so equal magnitudes take the second form. The denominator is bad, and the
+// result (NaN, NaN), when d is NaN or zero. That one test also covers a NaN
+// part of v (the comparison fails, w and d become NaN) and a zero v (the
+// second form then divides 0 by 0).
+//
+// The work is split in two so that a constant divisor is scaled once. Both
+// forms of the numerator are computed and one is selected, without a
+// branch, so that a loop over elements can run several at once; the
+// selected bits are those of the form taken.
+template <class T>
+struct ScaledDivisor {
+    T w;
+    T d;
+    bool realLarger;
+};
+
+template <class T>
+inline ScaledDivisor<T> ScaleDivisor(T vr, T vi)
+{
+    const bool realLarger = std::fabs(vr) > std::fabs(vi);
+    const T larger = realLarger ? vr : vi;
+    const T smaller = realLarger ? vi : vr;
+    const T w = smaller / larger;
+    return {w, larger + w * smaller, realLarger};
+}
+
+template <class T>
+inline std::complex<T> Divide(T ur, T ui, ScaledDivisor<T> v)
+{
+    const T reFirst = ur + ui * v.w, reSecond = ur * v.w + ui;
+    const T imFirst = ui - ur * v.w, imSecond = ui * v.w - ur;
+    const T re = (v.realLarger ? reFirst : reSecond) / v.d;
+    const T im = (v.realLarger ? imFirst : imSecond) / v.d;
+    const bool bad = (v.d != v.d) | (v.d == T(0));
+    return std::complex<T>(bad ? DefaultNaN<T>() : re, bad ? DefaultNaN<T>() : im);
+}
+
 template <class T>
 inline std::complex<T> Quotient(T ur, T ui, T vr, T vi)
 {
-    const std::complex<T> bad(DefaultNaN<T>(), DefaultNaN<T>());
-    if (std::isnan(vr) || std::isnan(vi)) return bad;
-    if (std::fabs(vr) > std::fabs(vi)) {
-        const T w = vi / vr;
-        const T d = vr + w * vi;
-        if (std::isnan(d) || d == T(0)) return bad;
-        return std::complex<T>((ur + ui * w) / d, (ui - ur * w) / d);
-    }
-    // Here |vr| <= |vi|, so a zero vi means a zero denominator.
-    if (vi == T(0)) return bad;
-    const T w = vr / vi;
-    const T d = vi + w * vr;
-    if (std::isnan(d) || d == T(0)) return bad;
-    return std::complex<T>((ur * w + ui) / d, (ui * w - ur) / d);
+    return Divide(ur, ui, ScaleDivisor(vr, vi));
 }
 
 }  // namespace cpp
