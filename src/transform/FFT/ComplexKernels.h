@@ -279,29 +279,103 @@ void LastStage(const FFTPlan<E>& plan, E* re, E* im)
 }
 
 // The bit-reversal permutation as a copy between distinct arrays, from the
-// swap table alone: walking it downwards and writing both partners of every
-// entry leaves each point at its place, because an entry equal to its index
-// whose partner lies below is rewritten later by that partner's entry. The
-// result is that of a copy followed by the exchanges, without their
-// dependent loads and stores. kConjugate negates the imaginary parts on the
-// way, as the inverse needs. The layouts of source and destination may
-// differ.
+// swap table alone, with the result of a copy followed by the exchanges in
+// place. kConjugate negates the imaginary parts on the way, as the inverse
+// needs; the layouts of source and destination may differ.
+//
+// Small transforms walk the table downwards and write both partners of
+// every entry: each point ends at its place, because an entry equal to its
+// index whose partner lies below is rewritten later by that partner's
+// entry. Large ones, whose arrays overflow the caches, copy straight first
+// and then let every entry exchange its two points from the source, tile by
+// tile: 2^kTileBits high index bits by 2^kTileBits low ones, so that the
+// points of a tile and their partners share a few cache lines. There an
+// entry equal to its index stores the destination's own value back instead
+// of branching, and the order of the entries no longer matters.
+constexpr std::uint32_t kTileBits = 4;
+constexpr std::uint32_t kLargestUntiledOrder = 12;
+
+template <class E, bool kSrcPairs, bool kConjugate>
+inline E SourceIm(const E* srcRe, const E* srcIm, std::size_t k)
+{
+    const E v = Layout<kSrcPairs>::Im(srcRe, srcIm, k);
+    return kConjugate ? -v : v;
+}
+
 template <class E, bool kSrcPairs, bool kDstPairs, bool kConjugate>
-[[gnu::noinline]] void PermuteInto(std::size_t n, const std::uint32_t* __restrict table, const E* __restrict srcRe,
-                                   const E* __restrict srcIm, E* __restrict dstRe, E* __restrict dstIm)
+[[gnu::noinline]] void ScatterDownwards(std::size_t n, const std::uint32_t* __restrict table,
+                                        const E* __restrict srcRe, const E* __restrict srcIm, E* __restrict dstRe,
+                                        E* __restrict dstIm)
 {
     using S = Layout<kSrcPairs>;
     using D = Layout<kDstPairs>;
-    const auto im = [&](std::size_t k) { return kConjugate ? -S::Im(srcRe, srcIm, k) : S::Im(srcRe, srcIm, k); };
     D::Re(dstRe, dstIm, n - 1) = S::Re(srcRe, srcIm, n - 1);
-    D::Im(dstRe, dstIm, n - 1) = im(n - 1);
+    D::Im(dstRe, dstIm, n - 1) = SourceIm<E, kSrcPairs, kConjugate>(srcRe, srcIm, n - 1);
     for (std::size_t i = n - 1; i-- > 0;) {
         const std::size_t p = table[i];
-        D::Re(dstRe, dstIm, i) = S::Re(srcRe, srcIm, p);
-        D::Im(dstRe, dstIm, i) = im(p);
-        D::Re(dstRe, dstIm, p) = S::Re(srcRe, srcIm, i);
-        D::Im(dstRe, dstIm, p) = im(i);
+        const E pr = S::Re(srcRe, srcIm, p), ir = S::Re(srcRe, srcIm, i);
+        const E pi = SourceIm<E, kSrcPairs, kConjugate>(srcRe, srcIm, p);
+        const E ii = SourceIm<E, kSrcPairs, kConjugate>(srcRe, srcIm, i);
+        D::Re(dstRe, dstIm, i) = pr;
+        D::Im(dstRe, dstIm, i) = pi;
+        D::Re(dstRe, dstIm, p) = ir;
+        D::Im(dstRe, dstIm, p) = ii;
     }
+}
+
+template <class E, bool kSrcPairs, bool kDstPairs, bool kConjugate>
+[[gnu::noinline]] void CopyLayout(std::size_t n, const E* __restrict srcRe, const E* __restrict srcIm,
+                                  E* __restrict dstRe, E* __restrict dstIm)
+{
+    using S = Layout<kSrcPairs>;
+    using D = Layout<kDstPairs>;
+    for (std::size_t i = 0; i < n; ++i) {
+        D::Re(dstRe, dstIm, i) = S::Re(srcRe, srcIm, i);
+        D::Im(dstRe, dstIm, i) = SourceIm<E, kSrcPairs, kConjugate>(srcRe, srcIm, i);
+    }
+}
+
+template <class E, bool kSrcPairs, bool kDstPairs, bool kConjugate>
+[[gnu::noinline]] void ExchangeTiles(std::size_t n, std::uint32_t order, const std::uint32_t* __restrict table,
+                                     const E* __restrict srcRe, const E* __restrict srcIm, E* __restrict dstRe,
+                                     E* __restrict dstIm)
+{
+    using S = Layout<kSrcPairs>;
+    using D = Layout<kDstPairs>;
+    const std::size_t tile = std::size_t(1) << kTileBits;
+    const std::size_t middles = std::size_t(1) << (order - 2 * kTileBits);
+    const std::uint32_t highShift = order - kTileBits;
+    for (std::size_t m = 0; m < middles; ++m) {
+        for (std::size_t a = 0; a < tile; ++a) {
+            const std::size_t first = (a << highShift) | (m << kTileBits);
+            // The last point is its own partner and has no entry.
+            const std::size_t end = first + tile < n - 1 ? first + tile : n - 1;
+            for (std::size_t i = first; i < end; ++i) {
+                const std::size_t p = table[i];
+                const bool exchange = p != i;
+                const E pr = S::Re(srcRe, srcIm, p), ir = S::Re(srcRe, srcIm, i);
+                const E pi = SourceIm<E, kSrcPairs, kConjugate>(srcRe, srcIm, p);
+                const E ii = SourceIm<E, kSrcPairs, kConjugate>(srcRe, srcIm, i);
+                const E cr = D::Re(dstRe, dstIm, i), ci = D::Im(dstRe, dstIm, i);
+                D::Re(dstRe, dstIm, i) = exchange ? pr : cr;
+                D::Im(dstRe, dstIm, i) = exchange ? pi : ci;
+                D::Re(dstRe, dstIm, p) = exchange ? ir : cr;
+                D::Im(dstRe, dstIm, p) = exchange ? ii : ci;
+            }
+        }
+    }
+}
+
+template <class E, bool kSrcPairs, bool kDstPairs, bool kConjugate>
+void PermuteInto(std::size_t n, std::uint32_t order, const std::uint32_t* table, const E* srcRe, const E* srcIm,
+                 E* dstRe, E* dstIm)
+{
+    if (order <= kLargestUntiledOrder) {
+        ScatterDownwards<E, kSrcPairs, kDstPairs, kConjugate>(n, table, srcRe, srcIm, dstRe, dstIm);
+        return;
+    }
+    CopyLayout<E, kSrcPairs, kDstPairs, kConjugate>(n, srcRe, srcIm, dstRe, dstIm);
+    ExchangeTiles<E, kSrcPairs, kDstPairs, kConjugate>(n, order, table, srcRe, srcIm, dstRe, dstIm);
 }
 
 // Everything after the permutation: the stages, on data in bit-reversed
@@ -350,6 +424,19 @@ template <class E, bool kPairs>
     }
 }
 
+// Pairs out to split arrays, each re times scale and im times -scale when
+// kScale is set: the last step of the inverse fused with the split.
+template <class E, bool kScale>
+[[gnu::noinline]] void PairsToSplit(std::size_t n, const E* __restrict pairs, E* __restrict re, E* __restrict im,
+                                    E scale)
+{
+    const E negScale = -scale;
+    for (std::size_t i = 0; i < n; ++i) {
+        re[i] = kScale ? pairs[2 * i] * scale : pairs[2 * i];
+        im[i] = kScale ? pairs[2 * i + 1] * negScale : pairs[2 * i + 1];
+    }
+}
+
 // The transform of `size` points in place; kPairs selects the layout.
 template <class E, bool kPairs>
 void ForwardInPlace(const FFTPlan<E>& plan, E* re, E* im)
@@ -380,7 +467,7 @@ void ForwardInto(const FFTPlan<E>& plan, const E* srcRe, const E* srcIm, E* re, 
         Layout<kPairs>::Im(re, im, 0) = Layout<kPairs>::Im(srcRe, srcIm, 0);
         return;
     }
-    PermuteInto<E, kPairs, kPairs, false>(plan.size, plan.swapTable, srcRe, srcIm, re, im);
+    PermuteInto<E, kPairs, kPairs, false>(plan.size, plan.order, plan.swapTable, srcRe, srcIm, re, im);
     Stages<E, kPairs>(plan, re, im);
 }
 
@@ -393,9 +480,42 @@ void InverseInto(const FFTPlan<E>& plan, const E* srcRe, const E* srcIm, E* re, 
         return;
     }
     const E scale = E(1) / static_cast<E>(plan.size);
-    PermuteInto<E, kPairs, kPairs, true>(n, plan.swapTable, srcRe, srcIm, re, im);
+    PermuteInto<E, kPairs, kPairs, true>(n, plan.order, plan.swapTable, srcRe, srcIm, re, im);
     Stages<E, kPairs>(plan, re, im);
     ScaleConjugate<E, kPairs>(n, re, im, scale);
+}
+
+// Split arrays through a work array of pairs (2 * size elements): the
+// source is permuted into pairs, transformed there and split out into the
+// destination. The same bits as the transforms on pairs; the work array
+// keeps the real and imaginary streams apart from the caller's arrays,
+// which often lie a multiple of 4 KiB apart and would make loads wait on
+// unrelated stores.
+template <class E>
+void SplitForwardVia(const FFTPlan<E>& plan, const E* srcRe, const E* srcIm, E* work, E* re, E* im)
+{
+    if (plan.size == 1) {
+        re[0] = srcRe[0];
+        im[0] = srcIm[0];
+        return;
+    }
+    PermuteInto<E, false, true, false>(plan.size, plan.order, plan.swapTable, srcRe, srcIm, work, work + 1);
+    Stages<E, true>(plan, work, work + 1);
+    PairsToSplit<E, false>(plan.size, work, re, im, E(1));
+}
+
+template <class E>
+void SplitInverseVia(const FFTPlan<E>& plan, const E* srcRe, const E* srcIm, E* work, E* re, E* im)
+{
+    if (plan.size == 1) {
+        re[0] = srcRe[0];
+        im[0] = srcIm[0];
+        return;
+    }
+    const E scale = E(1) / static_cast<E>(plan.size);
+    PermuteInto<E, false, true, true>(plan.size, plan.order, plan.swapTable, srcRe, srcIm, work, work + 1);
+    Stages<E, true>(plan, work, work + 1);
+    PairsToSplit<E, true>(plan.size, work, re, im, scale);
 }
 
 // Interleaved (re, im) pairs, size of them, in place.

@@ -106,31 +106,30 @@ void ComplexInterleaved(const std::complex<E>* src, std::complex<E>* dst, const 
 }
 
 // Deinterleaved complex: the result is that of staging the input in the
-// destinations, pairing it up, transforming the pairs and splitting them
-// back. The transform runs on the split arrays directly, which gives the
-// same bits without the two copies; when no source overlaps a destination,
-// the permutation also serves as the staging copy.
+// destinations (which makes srcReal == dstReal and srcImag == dstImag
+// work), pairing it up in the plan's interleave scratch, transforming the
+// pairs and splitting them back. The pairing is fused with the permutation
+// and the split with the inverse's scaling; the staging copies are needed
+// only when a source overlaps a destination.
 template <class State, class E>
 void ComplexDeinterleaved(const E* srcReal, const E* srcImag, E* dstReal, E* dstImag, State* state, bool inverse)
 {
-    const FFTPlan<E>& plan = state->plan;
+    FFTPlan<E>& plan = state->plan;
     const unsigned int n = plan.size;
     const bool distinct = !Overlap(srcReal, dstReal, n) && !Overlap(srcReal, dstImag, n) &&
                           !Overlap(srcImag, dstReal, n) && !Overlap(srcImag, dstImag, n);
-    if (distinct) {
-        if (inverse) {
-            InverseInto<E, false>(plan, srcReal, srcImag, dstReal, dstImag);
-        } else {
-            ForwardInto<E, false>(plan, srcReal, srcImag, dstReal, dstImag);
-        }
-        return;
+    if (!distinct) {
+        utility::cpp::Move(n, srcReal, dstReal);
+        utility::cpp::Move(n, srcImag, dstImag);
+        srcReal = dstReal;
+        srcImag = dstImag;
     }
-    utility::cpp::Move(n, srcReal, dstReal);
-    utility::cpp::Move(n, srcImag, dstImag);
+    plan.interleaveScratch.Resize(2 * n);
+    E* pairs = plan.interleaveScratch.data();
     if (inverse) {
-        InverseInPlace<E, false>(plan, dstReal, dstImag);
+        SplitInverseVia(plan, srcReal, srcImag, pairs, dstReal, dstImag);
     } else {
-        ForwardInPlace<E, false>(plan, dstReal, dstImag);
+        SplitForwardVia(plan, srcReal, srcImag, pairs, dstReal, dstImag);
     }
 }
 

@@ -19,28 +19,43 @@ namespace cpp {
 // Splits the half-size spectrum Z (split arrays) into the spectra of the
 // even samples e and the odd samples o, and combines them into the packed
 // spectrum X[k] = e[k] + w^k o[k]. Bins k and H - k come from the same pair
-// Z[k], Z[H - k]: the upper bin takes the conjugates of the lower bin's e and
-// o, so every value is formed by the same operations as when the split is
-// stored first and the combine runs over it afterwards.
+// a = Z[k], b = Z[H - k] (k the lower one): the upper bin takes the
+// conjugates of the lower bin's e and o. Each loop forms e and o itself with
+// the same operations, so every value is that of storing the split first
+// and combining afterwards; the two loops store upwards and vectorise.
 template <class E>
-[[gnu::noinline]] void SplitCombine(std::size_t h, const E* __restrict zr, const E* __restrict zi,
+struct EvenOdd {
+    E oRe, oIm, eRe, eIm;
+};
+
+template <class E>
+inline EvenOdd<E> Split(E ar, E ai, E br, E bi)
+{
+    return {(ai + bi) * E(0.5), (ar - br) * E(-0.5), (br + ar) * E(0.5), (ai - bi) * E(0.5)};
+}
+
+template <class E>
+[[gnu::noinline]] void CombineLower(std::size_t h, const E* __restrict zr, const E* __restrict zi,
                                     const E* __restrict w, E* __restrict dst)
 {
-    const std::size_t q = h / 2;
-    for (std::size_t k = 1; k < q; ++k) {
-        const std::size_t j = h - k;
-        const E ar = zr[k], ai = zi[k], br = zr[j], bi = zi[j];
-        const E oRe = (ai + bi) * E(0.5);
-        const E oIm = (ar - br) * E(-0.5);
-        const E eRe = (br + ar) * E(0.5);
-        const E eIm = (ai - bi) * E(0.5);
+    for (std::size_t k = 1; k < h / 2; ++k) {
+        const EvenOdd<E> v = Split(zr[k], zi[k], zr[h - k], zi[h - k]);
         const E wr = w[2 * (k - 1)], wi = w[2 * (k - 1) + 1];
-        dst[2 * k] = (wr * oRe + eRe) - oIm * wi;
-        dst[2 * k + 1] = (oRe * wi + eIm) + wr * oIm;
-        const E vr = w[2 * (j - 1)], vi = w[2 * (j - 1) + 1];
-        const E cRe = -oIm, cIm = -eIm;
-        dst[2 * j] = (vr * oRe + eRe) - cRe * vi;
-        dst[2 * j + 1] = (oRe * vi + cIm) + vr * cRe;
+        dst[2 * k] = (wr * v.oRe + v.eRe) - v.oIm * wi;
+        dst[2 * k + 1] = (v.oRe * wi + v.eIm) + wr * v.oIm;
+    }
+}
+
+template <class E>
+[[gnu::noinline]] void CombineUpper(std::size_t h, const E* __restrict zr, const E* __restrict zi,
+                                    const E* __restrict w, E* __restrict dst)
+{
+    for (std::size_t j = h / 2 + 1; j < h; ++j) {
+        const EvenOdd<E> v = Split(zr[h - j], zi[h - j], zr[j], zi[j]);
+        const E oIm = -v.oIm, eIm = -v.eIm;
+        const E wr = w[2 * (j - 1)], wi = w[2 * (j - 1) + 1];
+        dst[2 * j] = (wr * v.oRe + v.eRe) - oIm * wi;
+        dst[2 * j + 1] = (v.oRe * wi + eIm) + wr * oIm;
     }
 }
 
@@ -65,14 +80,18 @@ void RealFFTForward(FFTPlan<E>& plan, const E* src, E* dst)
     // The samples, seen as H pairs, go into the scratch as split arrays in
     // bit-reversed order; the complex transform of H points runs there.
     plan.forwardScratch.Resize(2 * plan.size + 2);
+    // From 32 samples up, the imaginary parts start 16 elements past the end
+    // of the real ones, so the two streams do not sit a multiple of 4 KiB
+    // apart (the scratch holds 2N + 2 elements).
     E* zr = plan.forwardScratch.data();
-    E* zi = zr + h;
+    E* zi = zr + h + (h >= 16 ? 16 : 0);
     const FFTPlan<E>& half = *plan.halfPlan;
-    PermuteInto<E, true, false, false>(h, half.swapTable, src, src + 1, zr, zi);
+    PermuteInto<E, true, false, false>(h, half.order, half.swapTable, src, src + 1, zr, zi);
     Stages<E, false>(half, zr, zi);
 
     const E* w = plan.twiddles;
-    SplitCombine(h, zr, zi, w, dst);
+    CombineLower(h, zr, zi, w, dst);
+    CombineUpper(h, zr, zi, w, dst);
     // The middle bin has o = (Z[Q].im, 0) and e = (Z[Q].re, 0).
     const E oRe = zi[q], eRe = zr[q], oIm = E(0), eIm = E(0);
     const E wr = w[2 * (q - 1)], wi = w[2 * (q - 1) + 1];
