@@ -51,17 +51,19 @@ inline void Advance(Position& position, const Step& step)
     position.phase = static_cast<std::uint32_t>(phase);
 }
 
-// An output whose window may begin before the block: samples before index 0
-// come from history, newest first.
+// An output whose window may begin before the block: sample s < 0 is
+// history[-s - 1]. The window is split where it enters the block, so neither
+// part tests each sample; the order of the sum is unchanged.
 template <class T>
 T OutputReachingHistory(const T* branch, std::int64_t length, std::int64_t newest, const T* src, const T* history)
 {
+    const std::int64_t oldest = newest - length + 1;
+    std::int64_t fromHistory = -oldest;
+    if (fromHistory > length) fromHistory = length;
     T sum = T(0);
-    for (std::int64_t j = 0; j < length; ++j) {
-        const std::int64_t s = newest - length + 1 + j;
-        const T sample = s >= 0 ? src[s] : history[-s - 1];
-        sum += sample * branch[j];
-    }
+    std::int64_t j = 0;
+    for (; j < fromHistory; ++j) sum += history[-(oldest + j) - 1] * branch[j];
+    for (; j < length; ++j) sum += src[oldest + j] * branch[j];
     return sum;
 }
 
@@ -106,23 +108,34 @@ void LaneSums(const T* rows, std::size_t rowStride, const T* branch, std::size_t
     for (std::size_t k = 0; k < kLanes; ++k) sums[k] = acc[k];
 }
 
-// kLanes whole cycles from `position`, whose window must lie in the block.
-// Lane k is the cycle k further on: same branches, samples k * D later. At D
-// of 1 those samples are already side by side in src; otherwise they are
-// first gathered into `tile`, one row per sample offset of the cycle.
+// kLanes whole cycles from `position`. Lane k is the cycle k further on:
+// same branches, samples k * D later. When those samples already stand side
+// by side in src (D of 1, window inside the block) the lanes read src;
+// otherwise they are first gathered into `tile`, one row per sample offset of
+// the cycle, with samples before the block taken from history.
 template <class T>
-void CycleLanes(const PoolVector<PoolVector<T>>& branches, std::size_t length, const Step& step,
-                std::uint32_t down, const T* src, T* dst, Position& position, T* tile)
+void CycleLanes(const MultiRateRecord<T>& filter, std::size_t length, const Step& step, const T* src, T* dst,
+                Position& position, T* tile)
 {
+    const std::uint32_t down = filter.downFactor;
     const std::int64_t first = position.inputIndex - std::int64_t(length) + 1;
     const T* rows = src + first;
     std::size_t rowStride = 1;
-    if (down != 1) {
+    if (down != 1 || first < 0) {
         const std::uint64_t reach = (std::uint64_t(position.phase) + std::uint64_t(step.up - 1) * down) / step.up;
         const std::int64_t rowCount = std::int64_t(length) + std::int64_t(reach);
+        const T* history = filter.history.data();
         for (std::int64_t r = 0; r < rowCount; ++r) {
-            const T* column = src + first + r;
-            for (std::size_t k = 0; k < kLanes; ++k) tile[r * std::int64_t(kLanes) + std::int64_t(k)] = column[k * down];
+            T* row = tile + r * std::int64_t(kLanes);
+            const std::int64_t s0 = first + r;
+            if (s0 >= 0) {
+                for (std::size_t k = 0; k < kLanes; ++k) row[k] = src[s0 + std::int64_t(k * down)];
+            } else {
+                for (std::size_t k = 0; k < kLanes; ++k) {
+                    const std::int64_t s = s0 + std::int64_t(k * down);
+                    row[k] = s >= 0 ? src[s] : history[-s - 1];
+                }
+            }
         }
         rows = tile;
         rowStride = kLanes;
@@ -130,7 +143,8 @@ void CycleLanes(const PoolVector<PoolVector<T>>& branches, std::size_t length, c
     T sums[kLanes];
     for (std::uint32_t t = 0; t < step.up; ++t) {
         const std::int64_t offset = position.inputIndex - std::int64_t(length) + 1 - first;
-        LaneSums(rows + offset * std::int64_t(rowStride), rowStride, branches[position.phase].data(), length, sums);
+        LaneSums(rows + offset * std::int64_t(rowStride), rowStride, filter.phaseFilters[position.phase].data(), length,
+                 sums);
         for (std::size_t k = 0; k < kLanes; ++k) dst[k * step.up + t] = sums[k];
         Advance(position, step);
     }
@@ -139,8 +153,11 @@ void CycleLanes(const PoolVector<PoolVector<T>>& branches, std::size_t length, c
 }
 
 // Writes `count` outputs from `position` on, and leaves `position` after them.
-// The position never moves back within a call, so the outputs that reach
-// into history all come first, and the rest need no test per sample.
+// Whole groups of kLanes cycles go side by side where that pays; the other
+// outputs go four at a time, or one at a time, and those whose window
+// reaches into history one at a time through the split loop. The position
+// never moves back within a call, so once a window lies in the block all
+// later ones do.
 template <class T>
 void ComputeOutputs(const MultiRateRecord<T>& filter, const T* src, T* dst, std::int64_t count, Position& position)
 {
@@ -151,38 +168,41 @@ void ComputeOutputs(const MultiRateRecord<T>& filter, const T* src, T* dst, std:
     const std::size_t length = branches[0].size();
     const std::int64_t lengthSigned = std::int64_t(length);
 
-    std::int64_t n = 0;
-    for (; n < count && position.inputIndex < lengthSigned - 1; ++n) {
-        dst[n] = OutputReachingHistory(branches[position.phase].data(), lengthSigned, position.inputIndex, src,
-                                       filter.history.data());
-        Advance(position, step);
-    }
-
-    // Gathering a tile costs (L + D) * kLanes copies against U * L * kLanes
-    // products; when it would cost more than it saves, stay on the scalar path.
+    // A tile costs (L + D) * kLanes copies against U * L * kLanes products.
+    // At D of 1 it is needed only while windows reach into history, and pays
+    // there anyway; above, it is used only when it costs less than it saves.
     const std::int64_t cycleOutputs = std::int64_t(kLanes) * up;
     const std::int64_t tileRows = lengthSigned + std::int64_t(down);
-    const bool lanes = length > 0 && (down == 1 || (tileRows <= kTileRows && tileRows <= std::int64_t(up) * lengthSigned));
-    if (lanes && count - n >= cycleOutputs) {
-        T tile[kTileRows * kLanes];
-        for (; count - n >= cycleOutputs; n += cycleOutputs) {
-            CycleLanes(branches, length, step, down, src, dst + n, position, tile);
-        }
-    }
+    const bool tileAllowed = tileRows <= kTileRows && (down == 1 || tileRows <= std::int64_t(up) * lengthSigned);
+    T tile[kTileRows * kLanes];
 
-    for (; count - n >= 4; n += 4) {
-        const T* groupBranches[4];
-        const T* groupWindows[4];
-        for (int k = 0; k < 4; ++k) {
-            groupBranches[k] = branches[position.phase].data();
-            groupWindows[k] = src + (position.inputIndex - lengthSigned + 1);
+    std::int64_t n = 0;
+    while (n < count) {
+        const bool inBlock = position.inputIndex >= lengthSigned - 1;
+        if (length > 0 && count - n >= cycleOutputs && (tileAllowed || (down == 1 && inBlock))) {
+            CycleLanes(filter, length, step, src, dst + n, position, tile);
+            n += cycleOutputs;
+        } else if (!inBlock) {
+            dst[n] = OutputReachingHistory(branches[position.phase].data(), lengthSigned, position.inputIndex, src,
+                                           filter.history.data());
             Advance(position, step);
+            n += 1;
+        } else if (count - n >= 4) {
+            const T* groupBranches[4];
+            const T* groupWindows[4];
+            for (int k = 0; k < 4; ++k) {
+                groupBranches[k] = branches[position.phase].data();
+                groupWindows[k] = src + (position.inputIndex - lengthSigned + 1);
+                Advance(position, step);
+            }
+            FourOutputsFromBlock(groupBranches, groupWindows, length, dst + n);
+            n += 4;
+        } else {
+            dst[n] = OutputFromBlock(branches[position.phase].data(), length,
+                                     src + (position.inputIndex - lengthSigned + 1));
+            Advance(position, step);
+            n += 1;
         }
-        FourOutputsFromBlock(groupBranches, groupWindows, length, dst + n);
-    }
-    for (; n < count; ++n) {
-        dst[n] = OutputFromBlock(branches[position.phase].data(), length, src + (position.inputIndex - lengthSigned + 1));
-        Advance(position, step);
     }
 }
 
