@@ -673,4 +673,38 @@ TEST(ConvertSameBuffer, FloatAndIntInPlace)
     std::free(raw);
 }
 
+// Packed samples on the buffer of their own source: 3-byte writes trail
+// 4-byte reads one way, and 4-byte writes run over unread 3-byte sources the
+// other way. Either way the result is the ascending element loop's, emulated
+// here byte by byte.
+TEST(ConvertSameBuffer, PackedInPlaceFollowsAscendingOrder)
+{
+    const std::size_t n = 1000;
+    const auto floats = MixedSources<float>(n, 4200, -23);
+    std::vector<unsigned char> expected(n * sizeof(float));
+    std::memcpy(expected.data(), floats.data(), expected.size());
+    for (std::size_t i = 0; i < n; ++i) {
+        float x;
+        std::memcpy(&x, &expected[4 * i], sizeof x);
+        const int24_t word = RefStore<int24_t>(RefFromFloat<int>(x, -23, true));
+        std::memcpy(&expected[3 * i], word.bytes, 3);
+    }
+    void* raw = std::malloc(n * sizeof(float));
+    ASSERT_NE(nullptr, raw);
+    std::memcpy(raw, floats.data(), n * sizeof(float));
+    ku::Convert(static_cast<unsigned int>(n), static_cast<const float*>(raw), static_cast<int24_t*>(raw), -23, true);
+    EXPECT_EQ(0, std::memcmp(expected.data(), raw, expected.size()));
+
+    // And back to float on the same bytes.
+    for (std::size_t i = 0; i < n; ++i) {
+        int24_t word;
+        std::memcpy(word.bytes, &expected[3 * i], 3);
+        const float y = RefToReal<float>(RefInt24Value(word), 23);
+        std::memcpy(&expected[4 * i], &y, sizeof y);
+    }
+    ku::Convert(static_cast<unsigned int>(n), static_cast<const int24_t*>(raw), static_cast<float*>(raw), 23);
+    EXPECT_EQ(0, std::memcmp(expected.data(), raw, expected.size()));
+    std::free(raw);
+}
+
 }  // namespace

@@ -7,6 +7,7 @@
 #include <kestcore/utility/int24_t.h>
 
 #include "common/FloatToInt.h"
+#include "utility/VectorUtils/PackedBlocks.h"
 
 // Sample conversion between integer PCM and floating point.
 //
@@ -65,8 +66,8 @@ inline int ToInt32(Real value)
 }
 
 // The store rule of each destination: 8 and 16 bits keep the low bits (a
-// wrap, no limit), 32 bits keep everything, 24 bits saturate through the
-// type's conversion from int.
+// wrap, no limit), 32 bits keep everything. 24 bits saturate through the
+// type's conversion from int (in PackInBlocks).
 template <class Dst>
 inline Dst StoreInt32(int value);
 
@@ -86,12 +87,6 @@ template <>
 inline int StoreInt32<int>(int value)
 {
     return value;
-}
-
-template <>
-inline int24_t StoreInt32<int24_t>(int value)
-{
-    return int24_t(value);
 }
 
 // The limit on the source: anything at or beyond +-1 becomes exactly +-m; a
@@ -116,42 +111,60 @@ inline float RealToIntegerMultiplier(int scale)
 }
 
 // ---------------------------------------------------------------------------
-// Loop bodies, one per path.
+// Element loops. Each path hands its per-element step to one of these; the
+// packed 24-bit forms go through blocks so that the arithmetic still
+// vectorises.
 // ---------------------------------------------------------------------------
 
-template <class Src, class Real>
-void IntegerToReal(unsigned int count, const Src* src, Real* dst)
+template <class Src, class Dst, class ToInt>
+void StoreEach(unsigned int count, const Src* src, Dst* dst, ToInt toInt)
 {
-    for (std::size_t i = 0; i < count; ++i) dst[i] = static_cast<Real>(static_cast<int>(src[i]));
+    for (std::size_t i = 0; i < count; ++i) dst[i] = StoreInt32<Dst>(toInt(src[i]));
 }
 
-template <class Src, class Real>
-void IntegerToRealScaled(unsigned int count, const Src* src, Real* dst, Real multiplier)
+template <class Src, class ToInt>
+void StoreEach(unsigned int count, const Src* src, int24_t* dst, ToInt toInt)
 {
-    for (std::size_t i = 0; i < count; ++i) dst[i] = static_cast<Real>(static_cast<int>(src[i])) * multiplier;
+    PackInBlocks(count, src, dst, toInt);
 }
+
+template <class Src, class Real, class FromInt>
+void ReadEach(unsigned int count, const Src* src, Real* dst, FromInt fromInt)
+{
+    for (std::size_t i = 0; i < count; ++i) dst[i] = fromInt(static_cast<int>(src[i]));
+}
+
+template <class Real, class FromInt>
+void ReadEach(unsigned int count, const int24_t* src, Real* dst, FromInt fromInt)
+{
+    UnpackInBlocks(count, src, dst, fromInt);
+}
+
+// ---------------------------------------------------------------------------
+// The paths, chosen once per call.
+// ---------------------------------------------------------------------------
 
 template <class Src, class Real>
 void IntegerToReal(unsigned int count, const Src* src, Real* dst, int scale)
 {
     if (scale == 0) {
-        IntegerToReal(count, src, dst);
+        ReadEach(count, src, dst, [](int x) { return static_cast<Real>(x); });
     } else {
-        const Real multiplier = static_cast<Real>(IntegerToRealMultiplier(scale));
-        IntegerToRealScaled(count, src, dst, multiplier);
+        const Real m = static_cast<Real>(IntegerToRealMultiplier(scale));
+        ReadEach(count, src, dst, [m](int x) { return static_cast<Real>(x) * m; });
     }
 }
 
 template <bool kRound, class Dst>
 void FloatToIntegerUnscaled(unsigned int count, const float* src, Dst* dst)
 {
-    for (std::size_t i = 0; i < count; ++i) dst[i] = StoreInt32<Dst>(ToInt32<kRound>(src[i]));
+    StoreEach(count, src, dst, [](float x) { return ToInt32<kRound>(x); });
 }
 
 template <bool kRound, class Dst>
 void FloatToIntegerScaled(unsigned int count, const float* src, Dst* dst, float m)
 {
-    for (std::size_t i = 0; i < count; ++i) dst[i] = StoreInt32<Dst>(ToInt32<kRound>(LimitAndScale(src[i], m)));
+    StoreEach(count, src, dst, [m](float x) { return ToInt32<kRound>(LimitAndScale(x, m)); });
 }
 
 template <class Dst>
@@ -225,7 +238,7 @@ inline void Convert(unsigned int count, const int* src, double* dst, int scale)
 inline void Convert(unsigned int count, const int* src, int24_t* dst, int scale)
 {
     const int shift = scale & 31;
-    for (std::size_t i = 0; i < count; ++i) dst[i] = int24_t(src[i] >> shift);
+    StoreEach(count, src, dst, [shift](int x) { return x >> shift; });
 }
 
 inline void Convert(unsigned int count, const float* src, unsigned char* dst, int scale, bool round)
