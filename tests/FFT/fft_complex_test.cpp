@@ -1,6 +1,7 @@
 // Complex transforms through the public interface: known spectra at size 8,
 // zeros, round trips, the layouts against each other, and the odd orders.
 
+#include <algorithm>
 #include <cmath>
 #include <complex>
 #include <cstdint>
@@ -162,6 +163,43 @@ TYPED_TEST(FFTComplex, LayoutsAgreeBitForBit)
             ASSERT_TRUE(SameBitsArray(expectRe, inPlaceRe));
             ASSERT_TRUE(SameBitsArray(expectIm, inPlaceIm));
         }
+    }
+}
+
+// A destination that overlaps the source without coinciding: the data is
+// moved first, so the result is the transform of the source as it was.
+TYPED_TEST(FFTComplex, OverlappingSourceAndDestination)
+{
+    using E = TypeParam;
+    const unsigned int order = 7, n = 128;
+    const std::uint32_t seed = 88;
+    SCOPED_TRACE(SeedTrace(seed));
+    const auto x = kestaccel_test::RandomComplex<E>(n, seed);
+    const auto expectForward = TestFixture::Forward(order, x), expectInverse = TestFixture::Inverse(order, x);
+    StateHolder<typename TestFixture::Interleaved> state(order);
+    for (bool inverse : {false, true}) {
+        std::vector<std::complex<E>> buffer(n + 3);
+        std::copy(x.begin(), x.end(), buffer.begin() + 3);
+        if (inverse) {
+            FFTInv(buffer.data() + 3, buffer.data() + 1, state.get(), nullptr);
+        } else {
+            FFTFwd(buffer.data() + 3, buffer.data() + 1, state.get(), nullptr);
+        }
+        const auto& expected = inverse ? expectInverse : expectForward;
+        for (unsigned int k = 0; k < n; ++k) ASSERT_TRUE(kestaccel_test::SameBits(expected[k], buffer[k + 1])) << k;
+    }
+
+    // Split arrays: the imaginary destination overlaps the real source.
+    StateHolder<typename TestFixture::Deinterleaved> split(order);
+    std::vector<E> storage(3 * n), outRe(n);
+    for (unsigned int i = 0; i < n; ++i) {
+        storage[n / 2 + i] = x[i].real();
+        storage[2 * n + i] = x[i].imag();
+    }
+    FFTFwd(storage.data() + n / 2, storage.data() + 2 * n, outRe.data(), storage.data(), split.get(), nullptr);
+    for (unsigned int k = 0; k < n; ++k) {
+        ASSERT_TRUE(kestaccel_test::SameBits(expectForward[k].real(), outRe[k])) << k;
+        ASSERT_TRUE(kestaccel_test::SameBits(expectForward[k].imag(), storage[k])) << k;
     }
 }
 
