@@ -152,12 +152,58 @@ void CycleLanes(const MultiRateRecord<T>& filter, std::size_t length, const Step
     position.inputIndex += std::int64_t(kLanes - 1) * down;
 }
 
+// The run of outputs, at most `count`, whose windows reach into history. The
+// samples they read, from history and from the start of the block, are
+// staged side by side in `staging` (room for `stagingSize`), so that the run
+// goes four at a time like the outputs inside the block. Returns the number
+// of outputs written: the whole run, or one when it does not fit.
+template <class T>
+std::int64_t HistoryRun(const MultiRateRecord<T>& filter, std::int64_t length, const Step& step, const T* src,
+                        T* dst, std::int64_t count, Position& position, T* staging, std::int64_t stagingSize)
+{
+    const auto& branches = filter.phaseFilters;
+    const T* history = filter.history.data();
+    std::int64_t run = 0;
+    std::int64_t newest = position.inputIndex;
+    for (Position p = position; run < count && p.inputIndex < length - 1; Advance(p, step)) {
+        newest = p.inputIndex;
+        ++run;
+    }
+    const std::int64_t first = position.inputIndex - length + 1;
+    const std::int64_t span = newest - first + 1;
+    if (span > stagingSize) {
+        dst[0] = OutputReachingHistory(branches[position.phase].data(), length, position.inputIndex, src, history);
+        Advance(position, step);
+        return 1;
+    }
+    for (std::int64_t i = 0; i < span; ++i) {
+        const std::int64_t s = first + i;
+        staging[i] = s >= 0 ? src[s] : history[-s - 1];
+    }
+    std::int64_t n = 0;
+    for (; run - n >= 4; n += 4) {
+        const T* groupBranches[4];
+        const T* groupWindows[4];
+        for (int k = 0; k < 4; ++k) {
+            groupBranches[k] = branches[position.phase].data();
+            groupWindows[k] = staging + (position.inputIndex - length + 1 - first);
+            Advance(position, step);
+        }
+        FourOutputsFromBlock(groupBranches, groupWindows, std::size_t(length), dst + n);
+    }
+    for (; n < run; ++n) {
+        dst[n] = OutputFromBlock(branches[position.phase].data(), std::size_t(length),
+                                 staging + (position.inputIndex - length + 1 - first));
+        Advance(position, step);
+    }
+    return run;
+}
+
 // Writes `count` outputs from `position` on, and leaves `position` after them.
 // Whole groups of kLanes cycles go side by side where that pays; the other
-// outputs go four at a time, or one at a time, and those whose window
-// reaches into history one at a time through the split loop. The position
-// never moves back within a call, so once a window lies in the block all
-// later ones do.
+// outputs go four at a time, or one at a time, those whose window reaches
+// into history from a staged copy. The position never moves back within a
+// call, so once a window lies in the block all later ones do.
 template <class T>
 void ComputeOutputs(const MultiRateRecord<T>& filter, const T* src, T* dst, std::int64_t count, Position& position)
 {
@@ -183,10 +229,7 @@ void ComputeOutputs(const MultiRateRecord<T>& filter, const T* src, T* dst, std:
             CycleLanes(filter, length, step, src, dst + n, position, tile);
             n += cycleOutputs;
         } else if (!inBlock) {
-            dst[n] = OutputReachingHistory(branches[position.phase].data(), lengthSigned, position.inputIndex, src,
-                                           filter.history.data());
-            Advance(position, step);
-            n += 1;
+            n += HistoryRun(filter, lengthSigned, step, src, dst + n, count - n, position, tile, kTileRows * kLanes);
         } else if (count - n >= 4) {
             const T* groupBranches[4];
             const T* groupWindows[4];
