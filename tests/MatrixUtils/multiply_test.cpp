@@ -215,14 +215,17 @@ TYPED_TEST(MultiplyTyped, WorkedRowMajorExample)
     EXPECT_TRUE(SameBitsArray(expectedCol, c.data(), 4));
 }
 
-// A temporary that cannot be allocated (2^60 elements) throws before c is
-// touched, and before either operand is read past its first element.
+// A temporary of 2^60 complex doubles is more bytes than a size_t can
+// count, so it cannot be had: the call throws before c is touched and
+// before either operand is read past its first element. (The size is
+// refused before any allocation is attempted, so no memory is reserved.)
 TEST(Multiply, FailedTemporaryThrowsBadAllocAndLeavesOutput)
 {
-    const float a[1] = {1.0f}, b[1] = {2.0f};
-    GuardedBuffer<float> c(1, 7.0f);
+    using C = std::complex<double>;
+    const C a[1] = {C(1, 0)}, b[1] = {C(2, 0)};
+    GuardedBuffer<C> c(1, C(7, -7));
     EXPECT_THROW(Multiply(kestaccel::RowMajor, 1 << 30, 1 << 30, 1, a, b, c.data()), std::bad_alloc);
-    EXPECT_TRUE(SameBits(7.0f, c[0]));
+    EXPECT_TRUE(SameBits(C(7, -7), c[0]));
     EXPECT_TRUE(c.Intact());
 }
 
