@@ -301,8 +301,13 @@ KESTACCEL_API void Invert_Threshold_InPlace(unsigned int count, std::complex<dou
 //                                  is 1, MinMaxIndex's maximum index is 2).
 //   MinMax(src, n)                 peak magnitude: the larger of -minimum and
 //                                  maximum (pointer first, count second).
-//                                  Count 0 gives 0; with a NaN the maximum
-//                                  element is returned.
+//                                  Count 0 gives 0; when either is NaN the
+//                                  maximum element is returned as it is.
+// In the paired scan a NaN at element 0 stays the minimum; a later NaN may
+// become the maximum (as the larger of its pair, or the last single
+// element) until the next element tested for the maximum replaces it. The
+// peak-magnitude form pairs elements 0 and 1 first, the others start the
+// pairs at element 1, which only matters with NaNs.
 //
 //   MaxEvery(n, a, b, dst)         b[i] if b[i] > a[i], else a[i]
 //   MaxEvery_InPlace(n, src, sd)   sd[i] if sd[i] > src[i], else src[i]
