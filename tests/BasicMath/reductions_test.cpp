@@ -406,8 +406,18 @@ TEST(ScansFloat, IndexScansReportTheFirstOfEquals)
     EXPECT_TRUE(SameBits(0.0f, value));
 }
 
+TYPED_TEST(Reductions, MaxAndMinReadElementZeroForCountZero)
+{
+    using T = TypeParam;
+    const T x[] = {T(7), T(9), T(1)};
+    EXPECT_TRUE(SameBits(T(7), ku::Max(0u, x)));
+    EXPECT_TRUE(SameBits(T(7), ku::Min(0u, x)));
+}
+
 TEST(ScansFloat, IndexScansAcceptANullValueAndCountZero)
 {
+    EXPECT_EQ(0u, ku::MaxIndex(0u, nullptr, nullptr));
+    EXPECT_EQ(0u, ku::MinIndex(0u, nullptr, nullptr));
     const float x[] = {4, 9, 1};
     EXPECT_EQ(1u, ku::MaxIndex(3u, x, nullptr));
     EXPECT_EQ(2u, ku::MinIndex(3u, x, nullptr));
