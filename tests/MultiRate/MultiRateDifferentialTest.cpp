@@ -48,6 +48,7 @@ const std::vector<RateCase>& RateCases()
         {1, 4, 16, 0, 50},        // decimator: scalar groups of four
         {3, 700, 3 * 8, 0, 20},   // D beyond the tile
         {6, 5, 5, 0, 20},         // no tap survives
+        {1, 1, 2100, -1, 2200},   // history run too long to stage
     };
     return cases;
 }

@@ -22,7 +22,8 @@ namespace polyphase {
 constexpr std::size_t kLanes = 8;
 
 // Rows of the stack tile that holds, for eight cycles side by side, the
-// samples of one cycle. It bounds L + D on the vector path.
+// samples of one cycle: it bounds L + D on the vector path. The same memory
+// stages the samples of a run of outputs that reaches into history.
 constexpr std::int64_t kTileRows = 512;
 
 // A position on the high-rate axis, stepped by D from one output to the next.
@@ -155,8 +156,8 @@ void CycleLanes(const MultiRateRecord<T>& filter, std::size_t length, const Step
 // The run of outputs, at most `count`, whose windows reach into history. The
 // samples they read, from history and from the start of the block, are
 // staged side by side in `staging` (room for `stagingSize`), so that the run
-// goes four at a time like the outputs inside the block. Returns the number
-// of outputs written: the whole run, or one when it does not fit.
+// goes four at a time like the outputs inside the block; a run too long to
+// stage goes one output at a time. Returns the length of the run.
 template <class T>
 std::int64_t HistoryRun(const MultiRateRecord<T>& filter, std::int64_t length, const Step& step, const T* src,
                         T* dst, std::int64_t count, Position& position, T* staging, std::int64_t stagingSize)
@@ -172,9 +173,11 @@ std::int64_t HistoryRun(const MultiRateRecord<T>& filter, std::int64_t length, c
     const std::int64_t first = position.inputIndex - length + 1;
     const std::int64_t span = newest - first + 1;
     if (span > stagingSize) {
-        dst[0] = OutputReachingHistory(branches[position.phase].data(), length, position.inputIndex, src, history);
-        Advance(position, step);
-        return 1;
+        for (std::int64_t n = 0; n < run; ++n) {
+            dst[n] = OutputReachingHistory(branches[position.phase].data(), length, position.inputIndex, src, history);
+            Advance(position, step);
+        }
+        return run;
     }
     for (std::int64_t i = 0; i < span; ++i) {
         const std::int64_t s = first + i;
