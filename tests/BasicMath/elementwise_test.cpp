@@ -481,6 +481,12 @@ TYPED_TEST(Elementwise, RealInvertThreshold)
         EXPECT_TRUE(SameBitsArray(hand, same));
     }
 
+    // A NaN threshold passes the early test; no size reaches it, so every
+    // element becomes one of the NaN limits.
+    std::vector<T> unlimited = hand;
+    ku::Invert_Threshold_InPlace(5, unlimited.data(), std::numeric_limits<T>::quiet_NaN());
+    for (const T x : unlimited) EXPECT_TRUE(std::isnan(x));
+
     std::uint32_t seed = 2000;
     const T eps = std::numeric_limits<T>::epsilon();
     for (const T threshold : {T(0.75), T(3), eps, eps / 4, T(2) * eps}) {
@@ -520,6 +526,14 @@ TYPED_TEST(Elementwise, ComplexInvertThreshold)
     Z nan(std::numeric_limits<T>::quiet_NaN(), 1);
     ku::Invert_Threshold_InPlace(1, &nan, T(0.5));
     EXPECT_TRUE(std::isnan(nan.real()) && std::isnan(nan.imag()));
+
+    // A NaN threshold passes the early test; limit > p then fails, so a
+    // normal element takes the unlimited inverse.
+    std::vector<Z> unlimited = {{2, 0}, {0, 0}};
+    ku::Invert_Threshold_InPlace(2, unlimited.data(), std::numeric_limits<T>::quiet_NaN());
+    EXPECT_TRUE(SameBits(Z(T(0.5), -T(0)), unlimited[0]));
+    EXPECT_TRUE(std::isnan(unlimited[1].real()));
+    EXPECT_TRUE(SameBits(T(0), unlimited[1].imag()));
 
     const auto original = RandomComplex<T>(16, 2090);
     for (const T threshold : {T(0), T(-2)}) {
