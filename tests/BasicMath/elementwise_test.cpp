@@ -10,6 +10,7 @@
 
 #include <cmath>
 #include <complex>
+#include <cstring>
 #include <limits>
 #include <string>
 #include <type_traits>
@@ -345,6 +346,64 @@ TYPED_TEST(Elementwise, FlipCopiesForwardAndFlipInPlaceSwaps)
     EXPECT_TRUE(SameBitsArray(std::vector<T>{3, 2, 1}, three));
     EXPECT_TRUE(SameBitsArray(std::vector<T>{2, 1}, two));
     EXPECT_TRUE(SameBitsArray(std::vector<T>{7}, one));
+}
+
+// A destination that overlaps its source, one element ahead or behind, sees
+// exactly what the plain ascending loop sees: the vectorised kernels must
+// fall back where the overlap would change a value.
+TYPED_TEST(Elementwise, OverlappingBuffersFollowTheAscendingLoop)
+{
+    using T = TypeParam;
+    using Unary = void (*)(unsigned int, const T*, T*);
+    struct Case {
+        const char* name;
+        Unary run;
+        T (*expected)(T);
+    };
+    const Case cases[] = {
+        {"Sqr", [](unsigned int n, const T* s, T* d) { ku::Sqr(n, s, d); }, [](T x) { return x * x; }},
+        {"Inverse", [](unsigned int n, const T* s, T* d) { ku::Inverse(n, s, d); }, [](T x) { return T(1) / x; }},
+        {"Abs", [](unsigned int n, const T* s, T* d) { ku::Abs(n, s, d); }, [](T x) { return T(0) > x ? -x : x; }},
+        {"Normalize", [](unsigned int n, const T* s, T* d) { ku::Normalize(n, s, d, T(0.25), T(3)); },
+         [](T x) { return (x - T(0.25)) / T(3); }},
+    };
+    std::uint32_t seed = 1750;
+    for (const auto& c : cases) {
+        for (unsigned int n : {5u, 33u, 1023u}) {
+            for (const int shift : {1, -1}) {
+                SCOPED_TRACE(std::string(c.name) + " size " + std::to_string(n) + " shift " + std::to_string(shift) +
+                             " " + SeedTrace(seed));
+                auto buffer = RandomReals<T>(n + 1, seed++, T(-2), T(2));
+                auto expected = buffer;
+                const std::size_t from = shift > 0 ? 0 : 1, to = shift > 0 ? 1 : 0;
+                for (std::size_t i = 0; i < n; ++i) expected[to + i] = c.expected(expected[from + i]);
+                c.run(n, buffer.data() + from, buffer.data() + to);
+                EXPECT_TRUE(SameBitsArray(expected, buffer));
+            }
+        }
+    }
+
+    // Flip one element ahead of its source reads back what it wrote.
+    for (unsigned int n : {6u, 101u}) {
+        auto buffer = RandomReals<T>(n + 1, seed++);
+        auto expected = buffer;
+        for (std::size_t i = 0; i < n; ++i) expected[1 + i] = expected[n - 1 - i];
+        ku::Flip(n, buffer.data(), buffer.data() + 1);
+        EXPECT_TRUE(SameBitsArray(expected, buffer)) << "size " << n;
+    }
+
+    // The power spectrum written over its own complex source: value i lands
+    // on a component already read.
+    for (unsigned int n : {7u, 64u, 1023u}) {
+        auto z = RandomComplex<T>(n, seed++);
+        std::vector<T> expected(2 * n);
+        std::memcpy(expected.data(), z.data(), sizeof(T) * 2 * n);
+        for (std::size_t i = 0; i < n; ++i)
+            expected[i] = expected[2 * i] * expected[2 * i] + expected[2 * i + 1] * expected[2 * i + 1];
+        T* parts = reinterpret_cast<T*>(z.data());
+        ku::PowerSpectr(n, z.data(), parts);
+        EXPECT_TRUE(SameBitsArray(expected.data(), parts, 2 * n)) << "size " << n;
+    }
 }
 
 TYPED_TEST(Elementwise, NormalizeSubtractsThenDividesWithoutAZeroTest)
