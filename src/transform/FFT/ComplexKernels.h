@@ -181,28 +181,6 @@ struct FactorChunk {
     }
 };
 
-// One radix-2 stage over `blocks` blocks `span` points apart: in each,
-// point j pairs with point j + half (the second pointer pair), factor j.
-template <class E, bool kPairs>
-[[gnu::noinline]] void StageRun(std::size_t blocks, std::size_t span, std::size_t count, E* __restrict r0,
-                                E* __restrict i0, E* __restrict r1, E* __restrict i1, const E* __restrict wr,
-                                const E* __restrict wi)
-{
-    using L = Layout<kPairs>;
-    for (std::size_t b = 0; b < blocks; ++b) {
-        const std::size_t o = b * span;
-        for (std::size_t j = 0; j < count; ++j) {
-            E xr = L::Re(r0, i0, o + j), xi = L::Im(r0, i0, o + j);
-            E yr = L::Re(r1, i1, o + j), yi = L::Im(r1, i1, o + j);
-            Butterfly(xr, xi, yr, yi, wr[j], wi[j]);
-            L::Re(r0, i0, o + j) = xr;
-            L::Im(r0, i0, o + j) = xi;
-            L::Re(r1, i1, o + j) = yr;
-            L::Im(r1, i1, o + j) = yi;
-        }
-    }
-}
-
 // Two consecutive stages s and s + 1 over blocks of 4q points, q the half
 // span of stage s. Points j, j + q, j + 2q, j + 3q: stage s pairs the first
 // two and the last two with factor a[j]; stage s + 1 then pairs j with
@@ -261,20 +239,6 @@ void StagePair(const FFTPlan<E>& plan, std::uint32_t s, E* re, E* im)
                                 re + Offset<kPairs>(j0 + 2 * q), im + Offset<kPairs>(j0 + 2 * q),
                                 re + Offset<kPairs>(j0 + 3 * q), im + Offset<kPairs>(j0 + 3 * q), a.re, a.im, b.re,
                                 b.im, c.re, c.im);
-    }
-}
-
-// The last stage alone, when the number of stages after the third is odd.
-template <class E, bool kPairs>
-void LastStage(const FFTPlan<E>& plan, E* re, E* im)
-{
-    const std::size_t half = plan.size / 2;
-    FactorChunk<E> w;
-    for (std::size_t j0 = 0; j0 < half; j0 += kChunk) {
-        const std::size_t count = half - j0 < kChunk ? half - j0 : kChunk;
-        w.Gather(plan.twiddles, j0, count, 1);
-        StageRun<E, kPairs>(1, 0, count, re + Offset<kPairs>(j0), im + Offset<kPairs>(j0),
-                            re + Offset<kPairs>(j0 + half), im + Offset<kPairs>(j0 + half), w.re, w.im);
     }
 }
 
@@ -390,18 +354,21 @@ void Stages(const FFTPlan<E>& plan, E* re, E* im)
                       Layout<kPairs>::Im(re, im, 1));
         return;
     }
-    if (order == 2) {
+    // The stages after the first pass run in pairs; the first pass takes
+    // two or three stages so that an even number remains.
+    std::uint32_t s;
+    if ((order & 1u) == 0) {
         StagesOneTwo<E, kPairs>(n / 4, re, im);
-        return;
+        s = 3;
+    } else {
+        const E* tw = plan.twiddles;
+        const std::size_t stride = std::size_t(1) << (order - 3);
+        const E w[8] = {tw[0], tw[1], tw[2 * stride], tw[2 * stride + 1],
+                        tw[4 * stride], tw[4 * stride + 1], tw[6 * stride], tw[6 * stride + 1]};
+        StagesOneToThree<E, kPairs>(n / 8, re, im, w);
+        s = 4;
     }
-    const E* tw = plan.twiddles;
-    const std::size_t stride = std::size_t(1) << (order - 3);
-    const E w[8] = {tw[0], tw[1], tw[2 * stride], tw[2 * stride + 1],
-                    tw[4 * stride], tw[4 * stride + 1], tw[6 * stride], tw[6 * stride + 1]};
-    StagesOneToThree<E, kPairs>(n / 8, re, im, w);
-    std::uint32_t s = 4;
     for (; s + 1 <= order; s += 2) StagePair<E, kPairs>(plan, s, re, im);
-    if (s == order) LastStage<E, kPairs>(plan, re, im);
 }
 
 template <class E, bool kPairs>
