@@ -109,6 +109,31 @@ void LaneSums(const T* rows, std::size_t rowStride, const T* branch, std::size_t
     for (std::size_t k = 0; k < kLanes; ++k) sums[k] = acc[k];
 }
 
+// The next four outputs, or the next one, from `position`, whose windows lie
+// in `samples`, which begins at sample index `first`.
+template <class T>
+void NextFourOutputs(const PoolVector<PoolVector<T>>& branches, std::int64_t length, const Step& step,
+                     const T* samples, std::int64_t first, T* dst, Position& position)
+{
+    const T* groupBranches[4];
+    const T* groupWindows[4];
+    for (int k = 0; k < 4; ++k) {
+        groupBranches[k] = branches[position.phase].data();
+        groupWindows[k] = samples + (position.inputIndex - length + 1 - first);
+        Advance(position, step);
+    }
+    FourOutputsFromBlock(groupBranches, groupWindows, std::size_t(length), dst);
+}
+
+template <class T>
+void NextOutput(const PoolVector<PoolVector<T>>& branches, std::int64_t length, const Step& step, const T* samples,
+                std::int64_t first, T* dst, Position& position)
+{
+    *dst = OutputFromBlock(branches[position.phase].data(), std::size_t(length),
+                           samples + (position.inputIndex - length + 1 - first));
+    Advance(position, step);
+}
+
 // kLanes whole cycles from `position`. Lane k is the cycle k further on:
 // same branches, samples k * D later. When those samples already stand side
 // by side in src (D of 1, window inside the block) the lanes read src;
@@ -184,21 +209,8 @@ std::int64_t HistoryRun(const MultiRateRecord<T>& filter, std::int64_t length, c
         staging[i] = s >= 0 ? src[s] : history[-s - 1];
     }
     std::int64_t n = 0;
-    for (; run - n >= 4; n += 4) {
-        const T* groupBranches[4];
-        const T* groupWindows[4];
-        for (int k = 0; k < 4; ++k) {
-            groupBranches[k] = branches[position.phase].data();
-            groupWindows[k] = staging + (position.inputIndex - length + 1 - first);
-            Advance(position, step);
-        }
-        FourOutputsFromBlock(groupBranches, groupWindows, std::size_t(length), dst + n);
-    }
-    for (; n < run; ++n) {
-        dst[n] = OutputFromBlock(branches[position.phase].data(), std::size_t(length),
-                                 staging + (position.inputIndex - length + 1 - first));
-        Advance(position, step);
-    }
+    for (; run - n >= 4; n += 4) NextFourOutputs(branches, length, step, staging, first, dst + n, position);
+    for (; n < run; ++n) NextOutput(branches, length, step, staging, first, dst + n, position);
     return run;
 }
 
@@ -234,19 +246,10 @@ void ComputeOutputs(const MultiRateRecord<T>& filter, const T* src, T* dst, std:
         } else if (!inBlock) {
             n += HistoryRun(filter, lengthSigned, step, src, dst + n, count - n, position, tile, kTileRows * kLanes);
         } else if (count - n >= 4) {
-            const T* groupBranches[4];
-            const T* groupWindows[4];
-            for (int k = 0; k < 4; ++k) {
-                groupBranches[k] = branches[position.phase].data();
-                groupWindows[k] = src + (position.inputIndex - lengthSigned + 1);
-                Advance(position, step);
-            }
-            FourOutputsFromBlock(groupBranches, groupWindows, length, dst + n);
+            NextFourOutputs(branches, lengthSigned, step, src, 0, dst + n, position);
             n += 4;
         } else {
-            dst[n] = OutputFromBlock(branches[position.phase].data(), length,
-                                     src + (position.inputIndex - lengthSigned + 1));
-            Advance(position, step);
+            NextOutput(branches, lengthSigned, step, src, 0, dst + n, position);
             n += 1;
         }
     }
