@@ -3,8 +3,8 @@
 #include <cstddef>
 
 // Direct linear convolution, zero-stuffing up-sampling and phase-carrying
-// down-sampling. All index arithmetic is unsigned 32-bit, as the interface
-// defines it.
+// down-sampling. The output length, the rate-change indices and the phase
+// update are unsigned 32-bit arithmetic and wrap as the interface defines.
 namespace kestaccel {
 namespace utility {
 namespace cpp {
