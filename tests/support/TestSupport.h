@@ -10,6 +10,7 @@
 #include <cstring>
 #include <limits>
 #include <random>
+#include <sstream>
 #include <string>
 #include <type_traits>
 #include <vector>
@@ -39,12 +40,20 @@ T FromBits(BitsType<T> bits)
 // Equality of bit patterns, printed in hex, so that -0 against +0 and one NaN
 // payload against another both fail.
 template <class T>
+std::string HexBits(T value)
+{
+    std::ostringstream text;
+    text << value << " (0x" << std::hex << Bits(value) << ")";
+    return text.str();
+}
+
+template <class T>
 ::testing::AssertionResult SameBits(T expected, T actual)
 {
     if (Bits(expected) == Bits(actual)) return ::testing::AssertionSuccess();
-    return ::testing::AssertionFailure()
-           << "expected " << expected << " (0x" << std::hex << Bits(expected) << "), got " << actual
-           << " (0x" << Bits(actual) << ")" << std::dec;
+    // Formatted first: a stream manipulator does not carry from one streamed
+    // value to the next inside an assertion message.
+    return ::testing::AssertionFailure() << "expected " << HexBits(expected) << ", got " << HexBits(actual);
 }
 
 template <class T>
