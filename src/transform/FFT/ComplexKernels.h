@@ -215,6 +215,33 @@ template <class E, bool kPairs>
     }
 }
 
+// The last two stages: a single block of 4q = N points, whose factors are
+// the table itself at strides 2 and 1, read in place instead of gathered.
+template <class E, bool kPairs>
+[[gnu::noinline]] void LastStagePairRun(std::size_t q, E* __restrict r0, E* __restrict i0, E* __restrict r1,
+                                        E* __restrict i1, E* __restrict r2, E* __restrict i2, E* __restrict r3,
+                                        E* __restrict i3, const E* __restrict tw, const E* __restrict twUpper)
+{
+    using L = Layout<kPairs>;
+    for (std::size_t j = 0; j < q; ++j) {
+        E ar = L::Re(r0, i0, j), ai = L::Im(r0, i0, j), br = L::Re(r1, i1, j), bi = L::Im(r1, i1, j);
+        E cr = L::Re(r2, i2, j), ci = L::Im(r2, i2, j), dr = L::Re(r3, i3, j), di = L::Im(r3, i3, j);
+        const E war = tw[4 * j], wai = tw[4 * j + 1];
+        Butterfly(ar, ai, br, bi, war, wai);
+        Butterfly(cr, ci, dr, di, war, wai);
+        Butterfly(ar, ai, cr, ci, tw[2 * j], tw[2 * j + 1]);
+        Butterfly(br, bi, dr, di, twUpper[2 * j], twUpper[2 * j + 1]);
+        L::Re(r0, i0, j) = ar;
+        L::Im(r0, i0, j) = ai;
+        L::Re(r1, i1, j) = br;
+        L::Im(r1, i1, j) = bi;
+        L::Re(r2, i2, j) = cr;
+        L::Im(r2, i2, j) = ci;
+        L::Re(r3, i3, j) = dr;
+        L::Im(r3, i3, j) = di;
+    }
+}
+
 // Point k of the layout starts at element k * kStep of both pointers.
 template <bool kPairs>
 constexpr std::size_t Offset(std::size_t k)
@@ -228,6 +255,12 @@ void StagePair(const FFTPlan<E>& plan, std::uint32_t s, E* re, E* im)
     const std::size_t n = plan.size;
     const std::size_t q = std::size_t(1) << (s - 1);
     const std::size_t strideB = std::size_t(1) << (plan.order - s - 1);
+    if (4 * q == n) {
+        LastStagePairRun<E, kPairs>(q, re, im, re + Offset<kPairs>(q), im + Offset<kPairs>(q), re + Offset<kPairs>(2 * q),
+                                    im + Offset<kPairs>(2 * q), re + Offset<kPairs>(3 * q), im + Offset<kPairs>(3 * q),
+                                    plan.twiddles, plan.twiddles + 2 * q);
+        return;
+    }
     FactorChunk<E> a, b, c;
     for (std::size_t j0 = 0; j0 < q; j0 += kChunk) {
         const std::size_t count = q - j0 < kChunk ? q - j0 : kChunk;
