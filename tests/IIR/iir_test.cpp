@@ -10,6 +10,7 @@
 #include <limits>
 #include <vector>
 
+#include "support/AllocationCount.h"
 #include "support/TestSupport.h"
 
 namespace {
@@ -369,6 +370,34 @@ TYPED_TEST(IIRTyped, BadInitArgumentsLeaveThePointerAlone)
     EXPECT_EQ(sentinel, state);
     kf::IIRInit(static_cast<State**>(nullptr), taps.data(), 2, nullptr);
     kf::IIRInit_BiQuad(static_cast<State**>(nullptr), taps.data(), 1, nullptr);
+}
+
+}  // namespace
+
+// After init the filter allocates nothing, and Free gives back every block.
+namespace {
+
+TYPED_TEST(IIRBlock, FilteringAllocatesNothingAndFreeReleasesAll)
+{
+    KESTACCEL_REQUIRE_ALLOCATION_COUNTING();
+    using T = TypeParam;
+    for (const BlockShape shape : {BlockShape{2, 2}, BlockShape{2, 3}, BlockShape{4, 1}}) {
+        const auto taps = RandomSections<T>(shape.order, shape.sections, T(1.1), 77);
+        const auto input = RandomReals<T>(700, 78);
+        std::vector<T> out(input.size()), buffer(input);
+        ResetAllocationTally();
+        typename IIRTyped<T>::State* state = nullptr;
+        this->Create(shape, taps, std::vector<T>(shape.order * shape.sections), &state);
+        const std::size_t afterInit = CurrentAllocationTally().news;
+        EXPECT_GT(afterInit, 0u);
+        kf::IIR(700u, input.data(), out.data(), state);
+        kf::IIR_InPlace(700u, buffer.data(), state);
+        kf::IIR(input[0], state);
+        EXPECT_EQ(afterInit, CurrentAllocationTally().news) << "a filtering call allocated";
+        kf::IIRFree(state);
+        const AllocationTally tally = CurrentAllocationTally();
+        EXPECT_EQ(tally.news, tally.deletes);
+    }
 }
 
 }  // namespace

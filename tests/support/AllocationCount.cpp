@@ -1,4 +1,6 @@
-#include "AllocationCount.h"
+#include "support/AllocationCount.h"
+
+#include <kestaccel/VectorUtils.h>
 
 #include <atomic>
 #include <cstdlib>
@@ -48,6 +50,15 @@ void ResetAllocationTally()
     g_news.store(0);
     g_deletes.store(0);
     g_largest.store(0);
+}
+
+bool LibraryAllocationsAreCounted()
+{
+    ResetAllocationTally();
+    kestaccel::utility::Free(kestaccel::utility::Malloc_Float(1));
+    const bool counted = CurrentAllocationTally().news > 0;
+    ResetAllocationTally();
+    return counted;
 }
 
 }  // namespace kestaccel_test
