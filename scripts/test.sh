@@ -32,6 +32,7 @@ cmake -S . -B build-sanitize -DCMAKE_BUILD_TYPE=RelWithDebInfo \
     "-DCMAKE_SHARED_LINKER_FLAGS=-fsanitize=address,undefined"
 cmake --build build-sanitize -j "$jobs"
 ASAN_OPTIONS=detect_leaks=1:halt_on_error=1 UBSAN_OPTIONS=halt_on_error=1:print_stacktrace=1 \
+    LSAN_OPTIONS="suppressions=$PWD/scripts/lsan-suppressions.txt:print_suppressions=0" \
     ctest --test-dir build-sanitize --output-on-failure --timeout 900 -j "$jobs" -L bitexact
 
 step "x86-64-v3 build: the same bits as the baseline"
