@@ -1,10 +1,9 @@
 #!/usr/bin/env bash
 # Installs, as root, the Debian packages that the build and the tests need and
-# that are missing. Peers used only by the benchmarks are left to
-# scripts/bench.sh.
+# that are missing, and any further packages named as arguments.
 set -euo pipefail
 
-packages=(cmake g++ make pkg-config python3 binutils libeigen3-dev libgtest-dev libgmock-dev libbenchmark-dev)
+packages=(cmake g++ make pkg-config python3 binutils libeigen3-dev libgtest-dev libgmock-dev libbenchmark-dev "$@")
 missing=()
 for p in "${packages[@]}"; do
     dpkg-query -W -f='${Status}' "$p" 2>/dev/null | grep -q 'install ok installed' || missing+=("$p")
