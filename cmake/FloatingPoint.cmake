@@ -6,7 +6,7 @@
 #   target has FMA; every product and sum here is rounded on its own.
 # -mno-fma: with -march=x86-64-v3 GCC 12 still emits fused vfmaddsub for
 #   complex multiply loops at -O3, even under -ffp-contract=off.
-# No -ffast-math, no -Ofast: reassociation would change the order of sums.
+# Never fast-math in any form: reassociation would change the order of sums.
 add_library(kestaccel_fp_flags INTERFACE)
 if(MSVC)
     target_compile_options(kestaccel_fp_flags INTERFACE /fp:precise)
