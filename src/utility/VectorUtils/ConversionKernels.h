@@ -32,8 +32,12 @@ using kestcore::utility::int24_t;
 // lroundf. Written out because the library call blocks vectorisation and
 // returns a long, 32 bits on some platforms and 64 on others. trunc(x) and
 // the fraction x - trunc(x) are exact, and the fraction is only compared
-// with 0.5, so the processor's rounding mode has no say. A result outside the
-// range of int, and a NaN, give -2147483648, as truncation does.
+// with one half, so the processor's rounding mode has no say (an added
+// 0.49999997 would depend on it). A result outside the range of int, and a
+// NaN, give -2147483648, as truncation does: such an x is replaced by 0, so
+// its rounded value is 0 and the OR sets the sign bit alone. (A select there
+// would let g++ move the rounding under a branch, and with SSE4.1 its
+// trunc then keeps the loop scalar.)
 inline int RoundToInt32(float value)
 {
     const bool inRange = value >= -2147483648.0f && value < 2147483648.0f;
@@ -41,13 +45,14 @@ inline int RoundToInt32(float value)
     const int whole = static_cast<int>(x);
     const float fraction = x - static_cast<float>(whole);
     const int rounded = whole + (fraction >= 0.5f ? 1 : 0) - (fraction <= -0.5f ? 1 : 0);
-    return inRange ? rounded : INT_MIN;
+    return rounded | (inRange ? 0 : INT_MIN);
 }
 
 // The same for lround of a double. Halves at the edges of int round out of
 // range, hence the bounds at +-0.5. The step of one is added in double (an
-// exact sum of small integers) because g++ does not vectorise a double
-// comparison that selects an int.
+// exact sum of small integers), and the indefinite value is selected as the
+// double -2^31, because g++ does not vectorise a double comparison that
+// selects an int.
 inline int RoundToInt32(double value)
 {
     const bool inRange = value > -2147483648.5 && value < 2147483647.5;
@@ -55,8 +60,7 @@ inline int RoundToInt32(double value)
     const double whole = static_cast<double>(static_cast<int>(x));
     const double fraction = x - whole;
     const double step = (fraction >= 0.5 ? 1.0 : 0.0) - (fraction <= -0.5 ? 1.0 : 0.0);
-    const int rounded = static_cast<int>(whole + step);
-    return inRange ? rounded : INT_MIN;
+    return static_cast<int>(inRange ? whole + step : -2147483648.0);
 }
 
 template <bool kRound, class Real>
