@@ -484,6 +484,24 @@ TEST(DoubleToInt, MatchesPlainLoop)
     }
 }
 
+// A sweep over the float bit patterns with a stride prime to every power of
+// two, so that every exponent, both signs, NaNs and infinities are met with
+// varied fractions: the written-out rounding and truncation against lroundf
+// and the truncating conversion, through the unscaled int path.
+TEST(FloatToInt, BitPatternSweepMatchesRuntime)
+{
+    const std::uint32_t stride = 4099;
+    std::vector<float> src;
+    src.reserve((1ull << 32) / stride + 1);
+    for (std::uint64_t u = 0; u < (1ull << 32); u += stride) src.push_back(FromBits<float>(static_cast<std::uint32_t>(u)));
+    for (bool round : {false, true}) {
+        SCOPED_TRACE(::testing::Message() << "round " << round);
+        const auto dst = Converted<float, int>(src, 0, round);
+        for (std::size_t i = 0; i < src.size(); ++i)
+            ASSERT_EQ(round ? RefRound(src[i]) : RefTruncate(src[i]), dst[i]) << std::hexfloat << src[i];
+    }
+}
+
 template <class Src>
 std::vector<Src> RandomIntegers(std::size_t count, std::uint32_t seed)
 {
