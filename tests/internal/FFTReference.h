@@ -5,7 +5,7 @@
 // multiplication-free stages, then radix-2 stages with the twiddle loop
 // outside and the strided butterfly loop inside; the real transform through
 // its own copy of the split and combine steps. They share only the plan
-// (tables) with the library.
+// (tables) with the library. Sizes start at 2.
 
 #include <cstddef>
 #include <cstdint>
@@ -27,7 +27,6 @@ void Forward(const FFTPlan<E>& plan, E* data)
 {
     Pair<E>* a = reinterpret_cast<Pair<E>*>(data);
     const std::uint32_t n = plan.size;
-    if (n == 1) return;
     for (std::uint32_t i = 0; i <= n - 2; ++i) {
         const std::uint32_t p = plan.swapTable[i];
         if (p != i) {
@@ -72,7 +71,6 @@ void Inverse(const FFTPlan<E>& plan, E* data)
 {
     Pair<E>* a = reinterpret_cast<Pair<E>*>(data);
     const std::uint32_t n = plan.size;
-    if (n == 1) return;
     const E scale = E(1) / static_cast<E>(n);
     for (std::uint32_t i = 0; i < n; ++i) a[i].im = -a[i].im;
     Forward(plan, data);
@@ -88,11 +86,6 @@ template <class E>
 void RealForward(const FFTPlan<E>& plan, const E* src, E* dst)
 {
     const std::uint32_t n = plan.size;
-    if (n == 1) {
-        dst[0] = src[0];
-        dst[1] = 0;
-        return;
-    }
     if (n == 2) {
         dst[0] = src[1] + src[0];
         dst[1] = 0;
@@ -118,12 +111,8 @@ void RealForward(const FFTPlan<E>& plan, const E* src, E* dst)
     s[h + q] = {zq.im, 0};
     s[q] = {zq.re, 0};
     const Pair<E> z0 = s[0];
-    s[h] = {z0.im, 0};
-    s[0] = {z0.re, 0};
-    const Pair<E> xh = {s[0].re - s[h].re, s[0].im - s[h].im};
-    const Pair<E> x0 = {s[0].re + s[h].re, s[0].im + s[h].im};
-    s[h] = xh;
-    s[0] = x0;
+    s[h] = {z0.re - z0.im, 0};
+    s[0] = {z0.re + z0.im, 0};
     for (std::uint32_t k = 1; k <= h - 1; ++k) {
         const E wr = plan.twiddles[2 * (k - 1)], wi = plan.twiddles[2 * (k - 1) + 1];
         const Pair<E> o = s[h + k], e = s[k];
@@ -138,10 +127,6 @@ void RealInverse(const FFTPlan<E>& plan, const E* src, E* dst)
 {
     const std::uint32_t n = plan.size, h = n / 2;
     const E scale = E(1) / static_cast<E>(n);
-    if (n == 1) {
-        dst[0] = src[0];
-        return;
-    }
     if (n == 2) {
         dst[0] = (src[2] + src[0]) * scale;
         dst[1] = (src[0] - src[2]) * scale;
