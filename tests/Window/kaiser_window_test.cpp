@@ -6,6 +6,8 @@
 
 #include <cmath>
 #include <cstdint>
+#include <limits>
+#include <string>
 #include <vector>
 
 #include "support/TestSupport.h"
@@ -19,10 +21,9 @@ double ReferenceI0(double x)
 {
     if (x == 0.0) return 1.0;
     static const double c[15] = {
-        1440482982.27235,     356644482.244025,     21641557.2361227,    571661.130563785,
-        8307.92541809429,     75.4337328948189,     0.463076284721,      0.00202591084143397,
-        6.54858370096785e-06, 1.60224679395361e-08, 3.0093112711296e-11, 4.35125971262668e-14,
-        4.794402575483e-17,   3.80715242345326e-20, 2.10580722890567e-23,
+        1440482982.27235, 356644482.244025, 21641557.2361227, 571661.130563785, 8307.92541809429,
+        75.4337328948189, 0.463076284721, 0.00202591084143397, 6.54858370096785e-06, 1.60224679395361e-08,
+        3.0093112711296e-11, 4.35125971262668e-14, 4.794402575483e-17, 3.80715242345326e-20, 2.10580722890567e-23,
     };
     const double y = x * x;
     double p = c[14];
@@ -39,10 +40,11 @@ T KaiserFactor(unsigned int i, unsigned int n, T alpha)
     const double m = static_cast<double>(n - 1u) * 0.5;
     const double inv = 1.0 / ReferenceI0(a * m);
     const double d = static_cast<double>(i) - m;
-    const double r = std::sqrt(m * m - d * d);
-    return static_cast<T>(ReferenceI0(r * a) * inv);
+    return static_cast<T>(ReferenceI0(std::sqrt(m * m - d * d) * a) * inv);
 }
 
+// The mirrored sample is written only below the centre, so in place an odd
+// centre is multiplied once.
 template <class T>
 std::vector<T> Expected(unsigned int n, std::vector<T> data, T alpha)
 {
@@ -59,106 +61,44 @@ class KaiserWindow : public ::testing::Test {};
 using ElementTypes = ::testing::Types<float, double>;
 TYPED_TEST_SUITE(KaiserWindow, ElementTypes);
 
-const unsigned int kSizes[] = {2, 3, 4, 5, 8, 9, 16, 31, 64, 65, 256, 1001};
-
+// Out of place and in place, where an odd centre is multiplied once: its
+// factor I0(t) * (1 / I0(t)) is 1 up to rounding, and the double cases
+// include some where it is not exactly 1, so a second multiplication would
+// show (in float it always rounds to 1). alpha = 0, and n = 1 (m = 0)
+// whatever alpha, make every factor exactly 1: the source is copied, -0 and
+// NaN included. n = 0 writes nothing. The window of ones is symmetric.
 TYPED_TEST(KaiserWindow, MatchesPlainEvaluationBitForBit)
 {
     using T = TypeParam;
-    for (unsigned int n : kSizes) {
-        // Shape parameters alpha * (n - 1) / 2 of 0.5, 4 and 12, and a negative alpha.
-        for (double beta : {0.5, 4.0, 12.0, -6.0}) {
-            const T alpha = static_cast<T>(2.0 * beta / (n - 1));
+    unsigned int centreNotOne = 0;
+    for (unsigned int n : {0u, 1u, 2u, 3u, 4u, 5u, 8u, 9u, 16u, 31u, 64u, 65u, 256u, 1001u}) {
+        // Shape parameters alpha * (n - 1) / 2 from 0 to 12, and negative alphas.
+        for (double beta : {0.0, 0.5, 1.3, 2.2, 4.0, 7.4, 12.0, -6.0, -3.7}) {
+            const T alpha = static_cast<T>(n > 1 ? 2.0 * beta / (n - 1) : beta);
             const std::uint32_t seed = 500 + n;
             SCOPED_TRACE(SeedTrace(seed));
             SCOPED_TRACE("n=" + std::to_string(n) + " beta=" + std::to_string(beta));
-            const auto src = RandomReals<T>(n, seed);
+            auto src = RandomReals<T>(n, seed, T(-1e6), T(1e6));
+            if (n > 2) src[1] = std::numeric_limits<T>::quiet_NaN();
+            if (n > 0) src[0] = -T(0);
             GuardedBuffer<T> dst(n);
             ku::WindowKaiser(n, src.data(), dst.data(), alpha);
             EXPECT_TRUE(SameBitsArray(Expected(n, src, alpha), dst.values()));
+            if (beta == 0.0 || n == 1) {
+                EXPECT_TRUE(SameBitsArray(src, dst.values()));
+            }
             EXPECT_TRUE(dst.Intact());
-        }
-    }
-}
-
-TYPED_TEST(KaiserWindow, BothHalvesAgreeBitForBit)
-{
-    using T = TypeParam;
-    for (unsigned int n : kSizes) {
-        const std::vector<T> ones(n, T(1));
-        std::vector<T> w(n);
-        ku::WindowKaiser(n, ones.data(), w.data(), static_cast<T>(16.0 / (n - 1)));
-        for (unsigned int i = 0; i < n / 2; ++i) ASSERT_TRUE(SameBits(w[i], w[n - 1 - i])) << "n=" << n << " i=" << i;
-    }
-}
-
-// In place, the centre of an odd window is multiplied once. Its factor is
-// I0(t) * (1 / I0(t)), which is 1 up to rounding; the alphas below are
-// chosen among those where it is not exactly 1, so a second multiplication
-// would show. (In float that factor always rounds to 1.)
-TEST(KaiserWindow, InPlaceWritesOddCentreOnce)
-{
-    using T = double;
-    unsigned int cases = 0;
-    for (unsigned int n : {5u, 9u, 31u, 65u, 1001u}) {
-        for (int k = 1; k <= 40; ++k) {
-            const T alpha = static_cast<T>(0.37 * k / (n - 1));
-            if (Bits(KaiserFactor(n / 2, n, alpha)) == Bits(T(1))) continue;
-            ++cases;
-            const std::uint32_t seed = 700 + n;
-            SCOPED_TRACE(SeedTrace(seed));
-            auto data = RandomReals<T>(n, seed);
-            const auto expected = Expected(n, data, alpha);
+            auto data = src;
             ku::WindowKaiser(n, data.data(), data.data(), alpha);
-            ASSERT_TRUE(SameBitsArray(expected, data)) << "n=" << n << " k=" << k;
+            EXPECT_TRUE(SameBitsArray(Expected(n, src, alpha), data));
+            centreNotOne += n % 2 == 1 && Bits(KaiserFactor(n / 2, n, alpha)) != Bits(T(1));
+            std::vector<T> w(n, T(1));
+            ku::WindowKaiser(n, w.data(), w.data(), alpha);
+            for (unsigned int i = 0; i < n / 2; ++i) ASSERT_TRUE(SameBits(w[i], w[n - 1 - i])) << "at " << i;
         }
     }
-    EXPECT_GT(cases, 10u);
-}
-
-TYPED_TEST(KaiserWindow, AlphaZeroIsTheIdentity)
-{
-    using T = TypeParam;
-    for (unsigned int n : {1u, 2u, 3u, 64u, 1001u}) {
-        auto src = RandomReals<T>(n, 900 + n, T(-1e6), T(1e6));
-        src[0] = -T(0);
-        src[n - 1] = std::numeric_limits<T>::quiet_NaN();
-        GuardedBuffer<T> dst(n);
-        ku::WindowKaiser(n, src.data(), dst.data(), T(0));
-        EXPECT_TRUE(SameBitsArray(src, dst.values())) << "n=" << n;
-        EXPECT_TRUE(dst.Intact());
-    }
-}
-
-TYPED_TEST(KaiserWindow, SingleSampleIsCopied)
-{
-    using T = TypeParam;
-    for (T value : {T(-3.25), -T(0), T(7)}) {
-        GuardedBuffer<T> dst(1);
-        ku::WindowKaiser(1, &value, dst.data(), T(5));
-        EXPECT_TRUE(SameBits(value, dst[0]));
-        EXPECT_TRUE(dst.Intact());
-    }
-}
-
-TYPED_TEST(KaiserWindow, TwoSamplesBothTakeTheEdgeFactor)
-{
-    using T = TypeParam;
-    const T src[2] = {T(1), T(-1)};
-    T dst[2];
-    const T alpha = T(3);
-    ku::WindowKaiser(2, src, dst, alpha);
-    const T edge = static_cast<T>(1.0 / ReferenceI0(static_cast<double>(alpha) * 0.5));
-    EXPECT_TRUE(SameBits(edge, dst[0]));
-    EXPECT_TRUE(SameBits(-edge, dst[1]));
-}
-
-TYPED_TEST(KaiserWindow, CountZeroWritesNothingWhateverAlpha)
-{
-    using T = TypeParam;
-    for (T alpha : {T(0), T(1), std::numeric_limits<T>::quiet_NaN()}) {
-        GuardedBuffer<T> dst(0);
-        ku::WindowKaiser(0, static_cast<const T*>(nullptr), dst.data(), alpha);
-        EXPECT_TRUE(dst.Intact());
+    if (sizeof(T) == 8) {
+        EXPECT_GE(centreNotOne, 10u);
     }
 }
 
@@ -177,22 +117,18 @@ TEST(KaiserWindow, EdgeFactorFollowsTheBesselFunction)
     }
 }
 
-TEST(KaiserWindow, FloatRoundsEachFactorBeforeMultiplying)
+// The float member rounds each factor to float before multiplying; the
+// product in double, rounded once, differs in some samples, so the
+// reference above can tell the two apart.
+TEST(KaiserWindow, FloatRoundingOfTheFactorIsVisible)
 {
     const unsigned int n = 129;
-    const float alpha = 0.1f;
     const auto src = RandomReals<float>(n, 1234);
     std::vector<float> dst(n);
-    ku::WindowKaiser(n, src.data(), dst.data(), alpha);
+    ku::WindowKaiser(n, src.data(), dst.data(), 0.1f);
     unsigned int differing = 0;
-    for (unsigned int i = 0; i < (n + 1) / 2; ++i) {
-        const double a = alpha;
-        const double m = (n - 1) * 0.5;
-        const double d = i - m;
-        const double wide = ReferenceI0(std::sqrt(m * m - d * d) * a) * (1.0 / ReferenceI0(a * m));
-        differing += Bits(static_cast<float>(wide * src[i])) != Bits(dst[i]);
-        EXPECT_TRUE(SameBits(static_cast<float>(wide) * src[i], dst[i])) << "at " << i;
-    }
+    for (unsigned int i = 0; i < (n + 1) / 2; ++i)
+        differing += Bits(static_cast<float>(KaiserFactor<double>(i, n, 0.1f) * src[i])) != Bits(dst[i]);
     EXPECT_GT(differing, 0u);
 }
 
