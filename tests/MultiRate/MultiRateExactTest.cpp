@@ -1,42 +1,136 @@
-// Single calls of the multi-rate filter against hand-worked values and
-// against the zero-stuffing model of MultiRateTestSupport.h, bit for bit.
+// Bit-exact tests of the multi-rate filter: hand-worked values, and every
+// path of the polyphase kernel against the zero-stuffing model. The kernel
+// computes several outputs at once (eight cycles side by side, or four
+// consecutive outputs), each with its own sum; the rate cases run every path,
+// at factor pairs, tap counts and start positions that put the first outputs
+// into history.
 
 #include <gtest/gtest.h>
 
 #include <cstdint>
+#include <utility>
 #include <vector>
 
 #include "MultiRate/MultiRateTestSupport.h"
-#include "support/TestSupport.h"
 
 namespace {
 
 using namespace kestaccel_test;
+
+struct RateCase {
+    unsigned int up, down, tapCount;
+    int firstPosition;
+    unsigned int cycles;
+};
+
+const RateCase kCases[] = {
+    {1, 1, 20, 0, 40},           // plain FIR: eight lanes read src directly
+    {1, 1, 33, -2, 9},
+    {5, 1, 60, 3, 30},           // interpolator, lanes straight from src
+    {2, 3, 20, 0, 5},
+    {2, 3, 21, -4, 37},          // dropped tail tap, start in history
+    {3, 2, 10, 1, 41},
+    {147, 160, 147 * 8, 0, 19},  // 48000 to 44100: gathered tile
+    {160, 147, 160 * 6, 5, 17},  // and back
+    {147, 160, 147 * 32, -200, 9},
+    {7, 3, 7 * 40, -14, 25},     // long branches: many outputs reach history
+    {4, 4, 4 * 9, 2, 33},
+    {1, 4, 16, 0, 50},           // decimator: scalar groups of four
+    {3, 700, 3 * 8, 0, 20},      // D beyond the tile
+    {6, 5, 5, 0, 20},            // no tap survives: every output is +0
+    {4, 3, 0, -8, 10},           // no taps at all
+    {2, 0, 12, 11, 3},           // D = 0: the position stands still
+    {1, 1, 2100, -1, 2200},      // history run too long to stage
+};
 
 template <class T>
 class MultiRateExact : public ::testing::Test {};
 using ElementTypes = ::testing::Types<float, double>;
 TYPED_TEST_SUITE(MultiRateExact, ElementTypes);
 
-// x[u] = u + 1: every sample names its own index.
-template <class T>
-std::vector<T> Ramp(std::size_t count)
+// Two calls with an empty one between. The second call's first output lies
+// cycles * (D - 1) input samples further on than a seamless stream would,
+// since inputIndex is rebased by cycleCount and not by the samples consumed;
+// at D = 1 its first windows reach into the history the first call left.
+TYPED_TEST(MultiRateExact, CallsMatchZeroStuffingModel)
 {
-    std::vector<T> x(count);
-    for (std::size_t u = 0; u < count; ++u) x[u] = T(u + 1);
-    return x;
+    using T = TypeParam;
+    std::uint32_t seed = 700;
+    for (const RateCase& c : kCases) {
+        SCOPED_TRACE(::testing::Message() << "U=" << c.up << " D=" << c.down << " T=" << c.tapCount << " m0="
+                                          << c.firstPosition << " cycles=" << c.cycles);
+        SCOPED_TRACE(SeedTrace(seed));
+        const auto taps = RandomReals<T>(c.tapCount, seed++);
+        const std::int64_t consumed = std::int64_t(c.down) * c.cycles;
+        // Both calls read past their cycles * D samples; the model sees the same samples.
+        const auto x = RandomReals<T>(std::size_t(3 * consumed + 8), seed++);
+        MultiRateFilter<T> filter(c.up, c.down, taps, 1000, static_cast<unsigned int>(1000 + c.firstPosition));
+        const auto first = ProcessOnce(filter, c.up, x.data(), c.cycles);
+        ProcessOnce(filter, c.up, x.data() + consumed, 0);
+        const auto second = ProcessOnce(filter, c.up, x.data() + consumed, c.cycles);
+        const std::int64_t secondStart = c.firstPosition + (2 * consumed - c.cycles) * c.up;
+        EXPECT_TRUE(SameBitsArray(ZeroStuffedOutputs(x, taps, c.up, c.down, c.firstPosition, first.size()), first));
+        EXPECT_TRUE(SameBitsArray(ZeroStuffedOutputs(x, taps, c.up, c.down, secondStart, second.size()), second));
+    }
 }
 
-// Taps 1, 1000, 1000000 and zeros: the output at position m is
-// x_up[m] + 1000 x_up[m - 1] + 1000000 x_up[m - 2], which says where m lies.
-template <class T>
-std::vector<T> MarkerTaps(std::size_t count)
+// At D = 1 consecutive calls continue each other exactly: the history carries
+// the samples the next block's first outputs need, also when a block is
+// shorter than the history.
+TYPED_TEST(MultiRateExact, StreamingAtUnitDownFactorMatchesOneJointCall)
 {
-    std::vector<T> taps(count, T(0));
-    taps[0] = T(1);
-    taps[1] = T(1000);
-    taps[2] = T(1000000);
-    return taps;
+    using T = TypeParam;
+    const unsigned int blocks[] = {3, 1, 0, 7, 2, 16, 5, 9, 1, 24, 0};
+    const unsigned int total = 68;
+    std::uint32_t seed = 760;
+    // The last pair has windows too long to stage beside the block.
+    const std::pair<unsigned int, unsigned int> shapes[] = {{1, 1}, {1, 5}, {1, 24}, {3, 1}, {3, 5},
+                                                            {3, 24}, {8, 1}, {8, 5}, {8, 24}, {1, 4200}};
+    for (const auto& shape : shapes) {
+        const unsigned int up = shape.first;
+        SCOPED_TRACE(::testing::Message() << "U=" << up << " L=" << shape.second);
+        SCOPED_TRACE(SeedTrace(seed));
+        const auto taps = RandomReals<T>(std::size_t(up) * shape.second + 1, seed++);
+        // The first output lies 2 positions on, so the last ones read past the blocks.
+        const auto x = RandomReals<T>(total + 2, seed++);
+        MultiRateFilter<T> joint(up, 1, taps, 0, 2), streamed(up, 1, taps, 0, 2);
+        const auto expected = ProcessOnce(joint, up, x.data(), total);
+        EXPECT_TRUE(SameBitsArray(ZeroStuffedOutputs(x, taps, up, 1, 2, expected.size()), expected));
+        GuardedBuffer<T> out(expected.size());
+        std::size_t in = 0;
+        for (unsigned int b : blocks) {
+            streamed.Process(x.data() + in, out.data() + in * up, b);
+            in += b;
+        }
+        ASSERT_EQ(total, in);
+        EXPECT_TRUE(SameBitsArray(expected, out.values()));
+        EXPECT_TRUE(out.Intact());
+    }
+}
+
+// Source equal to destination: the results go to scratch and are then
+// overwritten by the buffer itself, so the buffer keeps its input; the
+// history and position still move on as for separate buffers.
+TYPED_TEST(MultiRateExact, SameSourceAndDestinationLeavesTheBufferAsItWas)
+{
+    using T = TypeParam;
+    const std::uint32_t seed = 795;
+    SCOPED_TRACE(SeedTrace(seed));
+    const unsigned int up = 3;
+    const auto taps = RandomReals<T>(3 * 10, seed);
+    const auto x = RandomReals<T>(200, seed + 1);
+    MultiRateFilter<T> inPlace(up, 1, taps, 0, 0), separate(up, 1, taps, 0, 0);
+    std::size_t in = 0;
+    for (unsigned int cycles : {4u, 2u, 0u, 9u, 1u}) {
+        // Room for the cycles * U outputs, which are computed in scratch.
+        std::vector<T> buffer(x.begin() + std::ptrdiff_t(in), x.begin() + std::ptrdiff_t(in + up * cycles + 1));
+        const std::vector<T> before = buffer;
+        inPlace.Process(buffer.data(), buffer.data(), cycles);
+        EXPECT_TRUE(SameBitsArray(before, buffer));
+        ProcessOnce(separate, up, x.data() + in, cycles);
+        in += cycles;
+    }
+    EXPECT_TRUE(SameBitsArray(ProcessOnce(separate, up, x.data() + in, 50), ProcessOnce(inPlace, up, x.data() + in, 50)));
 }
 
 TYPED_TEST(MultiRateExact, UnitFactorsReturnTheTapsForAnImpulse)
@@ -45,109 +139,41 @@ TYPED_TEST(MultiRateExact, UnitFactorsReturnTheTapsForAnImpulse)
     const std::uint32_t seed = 601;
     SCOPED_TRACE(SeedTrace(seed));
     const auto taps = RandomReals<T>(20, seed);
-    MultiRateFilter<T> filter(1, 1, taps, 0, 0);
     std::vector<T> impulse(20, T(0));
     impulse[0] = T(1);
-    GuardedBuffer<T> out(20);
-    filter.Process(impulse.data(), out.data(), 20);
+    MultiRateFilter<T> filter(1, 1, taps, 0, 0);
     // One product is the tap itself and every other is a zero: exact.
-    EXPECT_TRUE(SameBitsArray(taps.data(), out.data(), 20));
-    EXPECT_TRUE(out.Intact());
+    EXPECT_TRUE(SameBitsArray(taps, ProcessOnce(filter, 1, impulse.data(), 20)));
 }
 
-// U = 2, D = 3, first position 0 (equal reference and start): the outputs lie
-// at 0, 3, 6, 9, i.e. phase/inputIndex 0/0, 1/1, 0/3, 1/4.
-TYPED_TEST(MultiRateExact, TwoUpThreeDownOutputsLieEveryThirdPosition)
+// Input x[u] = u + 1 and taps 1, 1000, 1000000, then zeros: the output at
+// position m is x_up[m] + 1000 x_up[m - 1] + 1000000 x_up[m - 2], which says
+// where m lies.
+TYPED_TEST(MultiRateExact, OutputsLieWhereTheStartPositionSaysAndStepByD)
 {
     using T = TypeParam;
-    const auto x = Ramp<T>(6);
-    MultiRateFilter<T> filter(2, 3, MarkerTaps<T>(20), 1, 1);
-    GuardedBuffer<T> out(4);
-    filter.Process(x.data(), out.data(), 2);
-    // m = 0: x[0]; m = 3: 1000 x[1]; m = 6: x[3] + 1000000 x[2];
-    // m = 9: 1000 x[4].
-    const std::vector<T> expected = {T(1), T(2000), T(3000004), T(5000)};
-    EXPECT_TRUE(SameBitsArray(expected.data(), out.data(), 4));
-    EXPECT_TRUE(out.Intact());
-}
-
-TYPED_TEST(MultiRateExact, FiveCyclesOfTwoUpThreeDownReadFifteenWriteTen)
-{
-    using T = TypeParam;
-    const std::uint32_t seed = 602;
-    SCOPED_TRACE(SeedTrace(seed));
-    const auto taps = RandomReals<T>(20, seed);
-    const auto x = RandomReals<T>(15, seed + 1);
-    MultiRateFilter<T> filter(2, 3, taps, 1, 1);
-    GuardedBuffer<T> out(10);
-    filter.Process(x.data(), out.data(), 5);
-    const auto expected = ZeroStuffedOutputs(x, taps, 2, 3, 0, 10);
-    EXPECT_TRUE(SameBitsArray(expected.data(), out.data(), 10));
-    EXPECT_TRUE(out.Intact());
-}
-
-// Start 7 above the reference at U = 3: phase 1, inputIndex 2, position 7.
-TYPED_TEST(MultiRateExact, StartAboveReferenceSplitsIntoPhaseAndIndex)
-{
-    using T = TypeParam;
-    const auto x = Ramp<T>(4);
-    MultiRateFilter<T> filter(3, 1, MarkerTaps<T>(20), 100, 107);
-    GuardedBuffer<T> out(3);
-    filter.Process(x.data(), out.data(), 1);
-    // m = 7: 1000 x[2]; m = 8: 1000000 x[2]; m = 9: x[3].
-    const std::vector<T> expected = {T(3000), T(3000000), T(4)};
-    EXPECT_TRUE(SameBitsArray(expected.data(), out.data(), 3));
-    EXPECT_TRUE(out.Intact());
-}
-
-// Start 7 below the reference (the unsigned difference wraps): phase 2,
-// inputIndex -3, position -7; the first input sample is met at output 7.
-TYPED_TEST(MultiRateExact, StartBelowReferenceBeginsInThePast)
-{
-    using T = TypeParam;
-    const auto x = Ramp<T>(4);
-    MultiRateFilter<T> filter(3, 1, MarkerTaps<T>(20), 7, 0);
-    GuardedBuffer<T> out(12);
-    filter.Process(x.data(), out.data(), 4);
-    const std::vector<T> expected = {T(0), T(0), T(0), T(0), T(0), T(0), T(0), T(1), T(1000), T(1000000), T(2), T(2000)};
-    EXPECT_TRUE(SameBitsArray(expected.data(), out.data(), 12));
-    EXPECT_TRUE(out.Intact());
-}
-
-// The T % U taps past the last whole group of U take no part.
-TYPED_TEST(MultiRateExact, TailTapsBeyondTheLastWholeGroupAreDropped)
-{
-    using T = TypeParam;
-    const std::uint32_t seed = 603;
-    SCOPED_TRACE(SeedTrace(seed));
-    auto taps = RandomReals<T>(10, seed);
-    const auto x = RandomReals<T>(40, seed + 1);
-    std::vector<T> withoutTail(taps.begin(), taps.begin() + 9);
-    taps[9] = T(1e30);
-    MultiRateFilter<T> full(3, 2, taps, 0, 0);
-    MultiRateFilter<T> trimmed(3, 2, withoutTail, 0, 0);
-    std::vector<T> a(60), b(60);
-    full.Process(x.data(), a.data(), 20);
-    trimmed.Process(x.data(), b.data(), 20);
-    EXPECT_TRUE(SameBitsArray(b, a));
-    const auto expected = ZeroStuffedOutputs(x, withoutTail, 3, 2, 0, 60);
-    EXPECT_TRUE(SameBitsArray(expected, a));
-}
-
-TYPED_TEST(MultiRateExact, FewerTapsThanBranchesGivePositiveZeros)
-{
-    using T = TypeParam;
-    const auto x = RandomReals<T>(30, 604, T(-2), T(-1));
-    for (unsigned int tapCount : {0u, 1u, 3u}) {
-        SCOPED_TRACE(tapCount);
-        const std::vector<T> taps(tapCount, T(-0.5));
-        // Starting 8 positions back, the first outputs reach into history;
-        // 40 outputs then run through every later path as well.
-        MultiRateFilter<T> filter(4, 3, taps, 8, 0);
-        GuardedBuffer<T> out(40, T(7));
-        filter.Process(x.data(), out.data(), 10);
-        for (std::size_t n = 0; n < 40; ++n) EXPECT_TRUE(SameBits(T(0), out[n])) << "at " << n;
-        EXPECT_TRUE(out.Intact());
+    struct MarkerCase {
+        unsigned int up, down, reference, start, cycles;
+        std::vector<double> expected;
+    };
+    const MarkerCase cases[] = {
+        // U = 2, D = 3 from position 0: m = 0, 3, 6, 9 are phase/inputIndex
+        // 0/0, 1/1, 0/3, 1/4: x[0]; 1000 x[1]; x[3] + 1000000 x[2]; 1000 x[4].
+        {2, 3, 1, 1, 2, {1, 2000, 3000004, 5000}},
+        // Start 7 above the reference at U = 3: phase 1, inputIndex 2.
+        {3, 1, 100, 107, 1, {3000, 3000000, 4}},
+        // Start 7 below (the unsigned difference wraps): phase 2,
+        // inputIndex -3; the first sample is met at output 7.
+        {3, 1, 7, 0, 4, {0, 0, 0, 0, 0, 0, 0, 1, 1000, 1000000, 2, 2000}},
+    };
+    std::vector<T> taps(20, T(0)), x(6);
+    taps[0] = T(1), taps[1] = T(1000), taps[2] = T(1000000);
+    for (std::size_t u = 0; u < x.size(); ++u) x[u] = T(u + 1);
+    for (const MarkerCase& c : cases) {
+        SCOPED_TRACE(::testing::Message() << "U=" << c.up << " D=" << c.down << " start=" << c.start);
+        MultiRateFilter<T> filter(c.up, c.down, taps, c.reference, c.start);
+        EXPECT_TRUE(SameBitsArray(std::vector<T>(c.expected.begin(), c.expected.end()),
+                                  ProcessOnce(filter, c.up, x.data(), c.cycles)));
     }
 }
 
@@ -161,14 +187,9 @@ TYPED_TEST(MultiRateExact, OneTapAddsTheProductToPositiveZero)
     const std::vector<T> x = {T(0), -T(0), T(2), T(-3), T(1e-30), T(0), T(5), -T(0),
                               -T(0), T(0), T(0.25), T(-1), T(0)};
     MultiRateFilter<T> filter(1, 1, taps, 0, 0);
-    GuardedBuffer<T> out(x.size());
-    filter.Process(x.data(), out.data(), static_cast<unsigned int>(x.size()));
-    for (std::size_t n = 0; n < x.size(); ++n) {
-        const T expected = T(0) + x[n] * taps[0];
-        EXPECT_TRUE(SameBits(expected, out[n])) << "at " << n;
-    }
+    const auto out = ProcessOnce(filter, 1, x.data(), 13);
+    EXPECT_TRUE(SameBitsArray(ZeroStuffedOutputs(x, taps, 1, 1, 0, 13), out));
     for (std::size_t n : {0, 1, 8, 9, 12}) EXPECT_TRUE(SameBits(T(0), out[n])) << "at " << n;
-    EXPECT_TRUE(out.Intact());
 }
 
 TYPED_TEST(MultiRateExact, ReservedVectorIsNeverRead)
@@ -178,29 +199,8 @@ TYPED_TEST(MultiRateExact, ReservedVectorIsNeverRead)
     SCOPED_TRACE(SeedTrace(seed));
     const auto taps = RandomReals<T>(24, seed);
     const auto x = RandomReals<T>(30, seed + 1);
-    const PoolVector<T> garbage(24, T(123.25));
-    MultiRateFilter<T> plain(3, 2, taps, 0, 0);
-    MultiRateFilter<T> withReserved(3, 2, taps, 0, 0, garbage);
-    std::vector<T> a(45), b(45);
-    plain.Process(x.data(), a.data(), 15);
-    withReserved.Process(x.data(), b.data(), 15);
-    EXPECT_TRUE(SameBitsArray(a, b));
-}
-
-// With D = 0 the position stands still: every output is the first one.
-TYPED_TEST(MultiRateExact, ZeroDownFactorRepeatsOnePosition)
-{
-    using T = TypeParam;
-    const std::uint32_t seed = 606;
-    SCOPED_TRACE(SeedTrace(seed));
-    const auto taps = RandomReals<T>(12, seed);
-    const auto x = RandomReals<T>(8, seed + 1);
-    MultiRateFilter<T> filter(2, 0, taps, 0, 11);
-    GuardedBuffer<T> out(6);
-    filter.Process(x.data(), out.data(), 3);
-    const T expected = ZeroStuffedOutput(x, taps, 2, 11);
-    for (std::size_t n = 0; n < 6; ++n) EXPECT_TRUE(SameBits(expected, out[n])) << "at " << n;
-    EXPECT_TRUE(out.Intact());
+    MultiRateFilter<T> plain(3, 2, taps, 0, 0), withReserved(3, 2, taps, 0, 0, PoolVector<T>(24, T(123.25)));
+    EXPECT_TRUE(SameBitsArray(ProcessOnce(plain, 3, x.data(), 15), ProcessOnce(withReserved, 3, x.data(), 15)));
 }
 
 }  // namespace

@@ -7,20 +7,12 @@
 #include <kestaccel/MultiRate.h>
 
 #include <cstdint>
+#include <type_traits>
 #include <vector>
 
-namespace kestaccel_test {
+#include "support/TestSupport.h"
 
-template <class T>
-struct MultiRateTypes;
-template <>
-struct MultiRateTypes<float> {
-    using State = kestaccel::MRFState_Float;
-};
-template <>
-struct MultiRateTypes<double> {
-    using State = kestaccel::MRFState_Double;
-};
+namespace kestaccel_test {
 
 template <class T>
 using PoolVector = std::vector<T, kestcore::allocator::STLAllocator<T>>;
@@ -36,51 +28,45 @@ public:
     }
     ~MultiRateFilter() { kestaccel::filter::MRFFree(state_); }
     MultiRateFilter(const MultiRateFilter&) = delete;
-    MultiRateFilter& operator=(const MultiRateFilter&) = delete;
-
     void Process(const T* src, T* dst, unsigned int cycles) { kestaccel::filter::MRFProcess(src, dst, cycles, state_); }
-    typename MultiRateTypes<T>::State* state() const { return state_; }
 
 private:
-    typename MultiRateTypes<T>::State* state_ = nullptr;
+    std::conditional_t<std::is_same<T, float>::value, kestaccel::MRFState_Float, kestaccel::MRFState_Double>* state_ =
+        nullptr;
 };
 
-inline std::int64_t FloorDiv(std::int64_t a, std::int64_t b)
+// One call of `cycles` into a guarded buffer pre-filled with 7, so that an
+// output left unwritten or written past the end shows.
+template <class T>
+std::vector<T> ProcessOnce(MultiRateFilter<T>& filter, unsigned int up, const T* src, unsigned int cycles)
 {
-    const std::int64_t q = a / b;
-    return (a % b != 0 && (a < 0) != (b < 0)) ? q - 1 : q;
+    GuardedBuffer<T> out(std::size_t(up) * cycles, T(7));
+    filter.Process(src, out.data(), cycles);
+    EXPECT_TRUE(out.Intact());
+    return out.values();
 }
 
-// Output at high-rate position `position` of the stream x, where x[u] is the
-// stream's u-th sample and everything before x[0] is zero. Only the first
-// (tapCount / up) * up taps take part. The sum runs over the zero-stuffed
+// `count` outputs at high-rate positions first, first + down, ... of the
+// stream x, where everything before x[0] is zero. Only the first
+// (tapCount / up) * up taps take part. Each sum runs over the zero-stuffed
 // stream from the oldest sample to the newest, zeros included: adding a zero
 // product never changes a sum that started at +0, so the polyphase filter,
 // which skips them, must give these very bits.
 template <class T>
-T ZeroStuffedOutput(const std::vector<T>& x, const std::vector<T>& taps, unsigned int up, std::int64_t position)
-{
-    const std::int64_t used = std::int64_t(taps.size() / up) * up;
-    T sum = T(0);
-    for (std::int64_t k = used - 1; k >= 0; --k) {
-        const std::int64_t highRate = position - k;
-        T sample = T(0);
-        if (highRate >= 0 && highRate % up == 0) {
-            const std::int64_t u = highRate / up;
-            if (u < std::int64_t(x.size())) sample = x[std::size_t(u)];
-        }
-        sum += sample * taps[std::size_t(k)];
-    }
-    return sum;
-}
-
-// `count` outputs at positions first, first + down, ...
-template <class T>
 std::vector<T> ZeroStuffedOutputs(const std::vector<T>& x, const std::vector<T>& taps, unsigned int up,
                                   unsigned int down, std::int64_t first, std::size_t count)
 {
+    const std::int64_t used = std::int64_t(taps.size() / up) * up;
     std::vector<T> y(count);
-    for (std::size_t n = 0; n < count; ++n) y[n] = ZeroStuffedOutput(x, taps, up, first + std::int64_t(n) * down);
+    for (std::size_t n = 0; n < count; ++n) {
+        T sum = T(0);
+        for (std::int64_t k = used - 1; k >= 0; --k) {
+            const std::int64_t highRate = first + std::int64_t(n) * down - k;
+            const bool present = highRate >= 0 && highRate % up == 0 && highRate / up < std::int64_t(x.size());
+            sum += (present ? x[std::size_t(highRate / up)] : T(0)) * taps[std::size_t(k)];
+        }
+        y[n] = sum;
+    }
     return y;
 }
 
