@@ -334,13 +334,4 @@ TEST(Equal, ADifferenceAtAnyPositionIsFound)
     }
 }
 
-TEST(Equal, ComparesBytesNotFloatingValues)
-{
-    const float plusZero = 0.0f, minusZero = -0.0f;
-    EXPECT_FALSE(Equal(4u, reinterpret_cast<const unsigned char*>(&plusZero),
-                       reinterpret_cast<const unsigned char*>(&minusZero)));
-    const float nan = std::numeric_limits<float>::quiet_NaN();
-    EXPECT_TRUE(Equal(4u, reinterpret_cast<const unsigned char*>(&nan), reinterpret_cast<const unsigned char*>(&nan)));
-}
-
 }  // namespace
