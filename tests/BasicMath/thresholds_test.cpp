@@ -5,28 +5,16 @@
 #include <kestaccel/BasicMath.h>
 
 #include <cmath>
-#include <complex>
-#include <cstdint>
 #include <functional>
-#include <limits>
-#include <random>
-#include <string>
-#include <type_traits>
+#include <tuple>
 #include <utility>
-#include <vector>
 
 #include "support/TestSupport.h"
 
 namespace {
 
 namespace ku = kestaccel::utility;
-using kestaccel_test::Bits;
-using kestaccel_test::FromBits;
-using kestaccel_test::GuardedBuffer;
-using kestaccel_test::RandomReals;
-using kestaccel_test::SameBits;
-using kestaccel_test::SameBitsArray;
-using kestaccel_test::SeedTrace;
+using namespace kestaccel_test;
 
 // Overloads that must not exist: Trim is float only. Each detector first
 // sees the member that does exist.
@@ -40,8 +28,7 @@ struct HasThresholdLT : std::false_type {};
 template <class T>
 struct HasThresholdLT<T, std::void_t<decltype(ku::Threshold_LT_InPlace(0u, std::declval<T*>(), std::declval<T>()))>>
     : std::true_type {};
-static_assert(HasTrim<float>::value, "");
-static_assert(!HasTrim<double>::value, "Trim is float only");
+static_assert(HasTrim<float>::value && !HasTrim<double>::value, "Trim is float only");
 static_assert(HasThresholdLT<float>::value && HasThresholdLT<double>::value, "");
 static_assert(!HasThresholdLT<std::complex<float>>::value && !HasThresholdLT<std::complex<double>>::value,
               "no complex thresholds");
@@ -52,45 +39,51 @@ T QuietNaN(std::uint32_t payload)
     return FromBits<T>(Bits(std::numeric_limits<T>::quiet_NaN()) | payload);
 }
 
+// Count 0 first: it must write nothing past the (empty) destination.
+std::vector<unsigned int> SizesFromZero()
+{
+    std::vector<unsigned int> sizes = kestaccel_test::InterestingSizes();
+    sizes.insert(sizes.begin(), 0u);
+    return sizes;
+}
+
 // Each member with its definition written out as the scalar rule for one
-// element. In-place members are run through the same rule.
+// element, (level, value) being (low, high) for Trim. In-place members run
+// on a copy of the source in dst.
 template <class T>
 struct ThresholdCase {
     std::string name;
-    std::function<void(unsigned int n, const T* src, T* dst, T level, T value)> run;
+    bool inPlace;
+    std::function<void(unsigned int n, T* dst, const T* src, T level, T value)> run;
     std::function<T(T x, T level, T value)> rule;
 };
 
 template <class T>
 std::vector<ThresholdCase<T>> ThresholdCases()
 {
-    auto copyThen = [](unsigned int n, const T* src, T* dst) {
-        for (unsigned int i = 0; i < n; ++i) dst[i] = src[i];
+    using R = std::function<T(T, T, T)>;
+    const R lt = [](T x, T level, T) { return level > x ? level : x; };
+    const R gt = [](T x, T level, T) { return level < x ? level : x; };
+    const R ltVal = [](T x, T level, T value) { return level > x ? value : x; };
+    const R gtVal = [](T x, T level, T value) { return x > level ? value : x; };
+    std::vector<ThresholdCase<T>> cases = {
+        {"Threshold_LT_InPlace", true,
+         [](unsigned int n, T* d, const T*, T l, T) { ku::Threshold_LT_InPlace(n, d, l); }, lt},
+        {"Threshold_GT_InPlace", true,
+         [](unsigned int n, T* d, const T*, T l, T) { ku::Threshold_GT_InPlace(n, d, l); }, gt},
+        {"Threshold_LTVal", false,
+         [](unsigned int n, T* d, const T* s, T l, T v) { ku::Threshold_LTVal(n, s, d, l, v); }, ltVal},
+        {"Threshold_LTVal_InPlace", true,
+         [](unsigned int n, T* d, const T*, T l, T v) { ku::Threshold_LTVal_InPlace(n, d, l, v); }, ltVal},
+        {"Threshold_GTVal", false,
+         [](unsigned int n, T* d, const T* s, T l, T v) { ku::Threshold_GTVal(n, s, d, l, v); }, gtVal},
+        {"Threshold_GTVal_InPlace", true,
+         [](unsigned int n, T* d, const T*, T l, T v) { ku::Threshold_GTVal_InPlace(n, d, l, v); }, gtVal},
     };
-    return {
-        {"Threshold_LT_InPlace",
-         [=](unsigned int n, const T* s, T* d, T level, T) { copyThen(n, s, d); ku::Threshold_LT_InPlace(n, d, level); },
-         [](T x, T level, T) { return level > x ? level : x; }},
-        {"Threshold_GT_InPlace",
-         [=](unsigned int n, const T* s, T* d, T level, T) { copyThen(n, s, d); ku::Threshold_GT_InPlace(n, d, level); },
-         [](T x, T level, T) { return level < x ? level : x; }},
-        {"Threshold_LTVal", [](unsigned int n, const T* s, T* d, T level, T value) { ku::Threshold_LTVal(n, s, d, level, value); },
-         [](T x, T level, T value) { return level > x ? value : x; }},
-        {"Threshold_LTVal_InPlace",
-         [=](unsigned int n, const T* s, T* d, T level, T value) {
-             copyThen(n, s, d);
-             ku::Threshold_LTVal_InPlace(n, d, level, value);
-         },
-         [](T x, T level, T value) { return level > x ? value : x; }},
-        {"Threshold_GTVal", [](unsigned int n, const T* s, T* d, T level, T value) { ku::Threshold_GTVal(n, s, d, level, value); },
-         [](T x, T level, T value) { return x > level ? value : x; }},
-        {"Threshold_GTVal_InPlace",
-         [=](unsigned int n, const T* s, T* d, T level, T value) {
-             copyThen(n, s, d);
-             ku::Threshold_GTVal_InPlace(n, d, level, value);
-         },
-         [](T x, T level, T value) { return x > level ? value : x; }},
-    };
+    if constexpr (std::is_same<T, float>::value)
+        cases.push_back({"Trim", true, [](unsigned int n, T* d, const T*, T low, T high) { ku::Trim(n, d, low, high); },
+                         [](T x, T low, T high) { return low > x ? low : (high < x ? high : x); }});
+    return cases;
 }
 
 template <class T>
@@ -99,63 +92,47 @@ using FloatingTypes = ::testing::Types<float, double>;
 TYPED_TEST_SUITE(Thresholds, FloatingTypes);
 
 template <class T>
-std::vector<T> Run(const ThresholdCase<T>& c, const std::vector<T>& src, T level, T value)
+std::vector<T> RunCase(const ThresholdCase<T>& c, const std::vector<T>& src, T level, T value)
 {
-    GuardedBuffer<T> dst(src.size());
-    c.run(static_cast<unsigned int>(src.size()), src.data(), dst.data(), level, value);
+    // An out-of-place member must write every element, so dst starts as a NaN.
+    GuardedBuffer<T> dst(src.size(), QuietNaN<T>(0x7E));
+    for (std::size_t i = 0; c.inPlace && i < src.size(); ++i) dst[i] = src[i];
+    c.run(static_cast<unsigned int>(src.size()), dst.data(), src.data(), level, value);
     EXPECT_TRUE(dst.Intact()) << c.name;
     return dst.values();
 }
 
-TYPED_TEST(Thresholds, EqualElementsPassAndStrictlyBeyondAreReplaced)
+TYPED_TEST(Thresholds, EqualElementsPassAndValueIsStoredAsGiven)
 {
     using T = TypeParam;
     const std::vector<T> x = {T(-1), T(0), T(1)};
     const auto cases = ThresholdCases<T>();
-    EXPECT_TRUE(SameBitsArray(std::vector<T>{T(0), T(0), T(1)}, Run(cases[0], x, T(0), T(0))));
-    EXPECT_TRUE(SameBitsArray(std::vector<T>{T(-1), T(0), T(0)}, Run(cases[1], x, T(0), T(0))));
-    EXPECT_TRUE(SameBitsArray(std::vector<T>{T(5), T(0), T(1)}, Run(cases[2], x, T(0), T(5))));
-    EXPECT_TRUE(SameBitsArray(std::vector<T>{T(5), T(0), T(1)}, Run(cases[3], x, T(0), T(5))));
-    EXPECT_TRUE(SameBitsArray(std::vector<T>{T(-1), T(0), T(-5)}, Run(cases[4], x, T(0), T(-5))));
-    EXPECT_TRUE(SameBitsArray(std::vector<T>{T(-1), T(0), T(-5)}, Run(cases[5], x, T(0), T(-5))));
+    const T nan = QuietNaN<T>(0x55);
+    // Member, value, result at level 0; the value goes in as given, on the
+    // other side of the level or NaN.
+    const std::tuple<int, T, std::vector<T>> table[] = {
+        {0, T(0), {T(0), T(0), T(1)}},    {1, T(0), {T(-1), T(0), T(0)}},     {2, T(5), {T(5), T(0), T(1)}},
+        {4, T(-5), {T(-1), T(0), T(-5)}}, {2, T(100), {T(100), T(0), T(1)}},  {3, nan, {nan, T(0), T(1)}},
+        {4, T(-100), {T(-1), T(0), T(-100)}}, {5, nan, {T(-1), T(0), nan}}};
+    for (const auto& [k, value, expected] : table)
+        EXPECT_TRUE(SameBitsArray(expected, RunCase(cases[k], x, T(0), value))) << cases[k].name;
 }
 
-TYPED_TEST(Thresholds, NaNElementsAndNaNLevelsChangeNothing)
+TYPED_TEST(Thresholds, NaNAndSignedZerosKeepTheirBits)
 {
     using T = TypeParam;
     const T nan = QuietNaN<T>(0x1234);
     const T negNan = -QuietNaN<T>(0x99);
-    const std::vector<T> x = {T(-3), nan, T(3), negNan, T(0)};
+    const std::vector<T> x = {T(-3), nan, T(3), negNan, T(0)}, zeros = {T(0), -T(0)};
     for (const auto& c : ThresholdCases<T>()) {
         SCOPED_TRACE(c.name);
-        const auto out = Run(c, x, T(0), T(7));
+        const auto out = RunCase(c, x, T(0), T(7));
         EXPECT_TRUE(SameBits(nan, out[1]));
         EXPECT_TRUE(SameBits(negNan, out[3]));
-        EXPECT_TRUE(SameBitsArray(x, Run(c, x, nan, T(7))));
+        EXPECT_TRUE(SameBitsArray(x, RunCase(c, x, nan, T(7))));
+        EXPECT_TRUE(SameBitsArray(zeros, RunCase(c, zeros, -T(0), T(9))));
+        EXPECT_TRUE(SameBitsArray(zeros, RunCase(c, zeros, T(0), T(9))));
     }
-}
-
-TYPED_TEST(Thresholds, SignedZerosCompareEqualAndKeepTheirBits)
-{
-    using T = TypeParam;
-    const std::vector<T> x = {T(0), -T(0)};
-    for (const auto& c : ThresholdCases<T>()) {
-        SCOPED_TRACE(c.name);
-        EXPECT_TRUE(SameBitsArray(x, Run(c, x, -T(0), T(9))));
-        EXPECT_TRUE(SameBitsArray(x, Run(c, x, T(0), T(9))));
-    }
-}
-
-TYPED_TEST(Thresholds, ValueIsStoredAsGivenEvenOnTheOtherSide)
-{
-    using T = TypeParam;
-    const T nan = QuietNaN<T>(0x55);
-    const std::vector<T> x = {T(-2), T(2)};
-    const auto cases = ThresholdCases<T>();
-    EXPECT_TRUE(SameBitsArray(std::vector<T>{T(100), T(2)}, Run(cases[2], x, T(0), T(100))));
-    EXPECT_TRUE(SameBitsArray(std::vector<T>{nan, T(2)}, Run(cases[3], x, T(0), nan)));
-    EXPECT_TRUE(SameBitsArray(std::vector<T>{T(-2), T(-100)}, Run(cases[4], x, T(0), T(-100))));
-    EXPECT_TRUE(SameBitsArray(std::vector<T>{T(-2), nan}, Run(cases[5], x, T(0), nan)));
 }
 
 // Random data with ties against the level, signed zeros and NaNs, across
@@ -180,14 +157,15 @@ TYPED_TEST(Thresholds, MatchTheScalarRuleOnRandomData)
 {
     using T = TypeParam;
     std::uint32_t seed = 2000;
-    const T level = T(0.25), value = T(-9.5);
     for (const auto& c : ThresholdCases<T>()) {
-        for (unsigned int n : kestaccel_test::InterestingSizes()) {
-            SCOPED_TRACE(c.name + " size " + std::to_string(n) + " " + SeedTrace(seed));
-            const auto x = LevelRichReals<T>(n, seed++, level);
-            std::vector<T> expected(n);
-            for (std::size_t i = 0; i < n; ++i) expected[i] = c.rule(x[i], level, value);
-            EXPECT_TRUE(SameBitsArray(expected, Run(c, x, level, value)));
+        for (const auto& [level, value] : {std::make_pair(T(0.25), T(-9.5)), std::make_pair(T(-0.5), T(0.75))}) {
+            for (unsigned int n : SizesFromZero()) {
+                SCOPED_TRACE(c.name + " size " + std::to_string(n) + " " + SeedTrace(seed));
+                const auto x = LevelRichReals<T>(n, seed++, level);
+                std::vector<T> expected(n);
+                for (std::size_t i = 0; i < n; ++i) expected[i] = c.rule(x[i], level, value);
+                EXPECT_TRUE(SameBitsArray(expected, RunCase(c, x, level, value)));
+            }
         }
     }
 }
@@ -199,83 +177,26 @@ TYPED_TEST(Thresholds, OverlappingOutOfPlaceFormsFollowTheAscendingLoop)
     const auto x = LevelRichReals<T>(n + 1, 2100, T(0));
     // dst one element behind src: the replacement written at i is read as
     // the source of i + 1.
-    for (int form = 0; form < 2; ++form) {
+    for (const auto& c : ThresholdCases<T>()) {
+        if (c.inPlace) continue;
         std::vector<T> buffer = x, expected = x;
-        for (std::size_t i = 0; i < n; ++i) {
-            const T v = expected[i];
-            expected[i + 1] = form == 0 ? (T(0) > v ? T(3) : v) : (v > T(0) ? T(-3) : v);
-        }
-        if (form == 0)
-            ku::Threshold_LTVal(n, buffer.data(), buffer.data() + 1, T(0), T(3));
-        else
-            ku::Threshold_GTVal(n, buffer.data(), buffer.data() + 1, T(0), T(-3));
-        EXPECT_TRUE(SameBitsArray(expected, buffer)) << "form " << form;
+        for (std::size_t i = 0; i < n; ++i) expected[i + 1] = c.rule(expected[i], T(0), T(3));
+        c.run(n, buffer.data() + 1, buffer.data(), T(0), T(3));
+        EXPECT_TRUE(SameBitsArray(expected, buffer)) << c.name;
     }
 }
 
-TYPED_TEST(Thresholds, CountZeroWritesNothing)
+TEST(TrimFloat, LowIsTestedFirstAndNaNPasses)
 {
-    using T = TypeParam;
-    T* none = nullptr;
-    ku::Threshold_LT_InPlace(0u, none, T(1));
-    ku::Threshold_GT_InPlace(0u, none, T(1));
-    ku::Threshold_LTVal(0u, none, none, T(1), T(2));
-    ku::Threshold_LTVal_InPlace(0u, none, T(1), T(2));
-    ku::Threshold_GTVal(0u, none, none, T(1), T(2));
-    ku::Threshold_GTVal_InPlace(0u, none, T(1), T(2));
-    ku::VectorSlope(0u, none, T(1), T(2));
-    GuardedBuffer<T> guarded(0);
-    ku::VectorSlope(0u, guarded.data(), T(1), T(2));
-    EXPECT_TRUE(guarded.Intact());
-}
-
-// ---------------------------------------------------------------------------
-// Trim.
-// ---------------------------------------------------------------------------
-float TrimRule(float x, float low, float high) { return low > x ? low : (high < x ? high : x); }
-
-std::vector<float> Trimmed(std::vector<float> x, float low, float high)
-{
-    ku::Trim(static_cast<unsigned int>(x.size()), x.data(), low, high);
-    return x;
-}
-
-TEST(TrimFloat, ClampsBothSides)
-{
-    EXPECT_TRUE(SameBitsArray(std::vector<float>{-1, -1, 0, 1, 1}, Trimmed({-2, -1, 0, 1, 2}, -1.0f, 1.0f)));
-}
-
-TEST(TrimFloat, LowIsTestedFirstWhenTheBoundsCross)
-{
-    EXPECT_TRUE(SameBitsArray(std::vector<float>{1, 1, -1}, Trimmed({-2, 0, 2}, 1.0f, -1.0f)));
-}
-
-TEST(TrimFloat, NaNElementStaysAndNaNBoundDisablesItsSide)
-{
+    const auto trim = ThresholdCases<float>().back();
     const float nan = QuietNaN<float>(0x321);
-    EXPECT_TRUE(SameBitsArray(std::vector<float>{nan, -1, 1}, Trimmed({nan, -5, 5}, -1.0f, 1.0f)));
-    EXPECT_TRUE(SameBitsArray(std::vector<float>{-5, 1}, Trimmed({-5, 5}, nan, 1.0f)));
-    EXPECT_TRUE(SameBitsArray(std::vector<float>{-1, 5}, Trimmed({-5, 5}, -1.0f, nan)));
-    EXPECT_TRUE(SameBitsArray(std::vector<float>{0.0f, -0.0f}, Trimmed({0.0f, -0.0f}, -0.0f, 0.0f)));
-    EXPECT_TRUE(SameBitsArray(std::vector<float>{0.0f, -0.0f}, Trimmed({0.0f, -0.0f}, 0.0f, -0.0f)));
-}
-
-TEST(TrimFloat, MatchesTheScalarRuleOnRandomData)
-{
-    std::uint32_t seed = 2200;
-    for (unsigned int n : kestaccel_test::InterestingSizes()) {
-        for (auto bounds : {std::make_pair(-0.5f, 0.75f), std::make_pair(0.5f, -0.5f)}) {
-            SCOPED_TRACE("size " + std::to_string(n) + " " + SeedTrace(seed));
-            const auto x = LevelRichReals<float>(n, seed++, bounds.first);
-            std::vector<float> expected(n);
-            for (std::size_t i = 0; i < n; ++i) expected[i] = TrimRule(x[i], bounds.first, bounds.second);
-            GuardedBuffer<float> buffer(n);
-            for (std::size_t i = 0; i < n; ++i) buffer[i] = x[i];
-            ku::Trim(n, buffer.data(), bounds.first, bounds.second);
-            EXPECT_TRUE(SameBitsArray(expected, buffer.values()));
-            EXPECT_TRUE(buffer.Intact());
-        }
-    }
+    EXPECT_TRUE(SameBitsArray({-1, -1, 0, 1, 1}, RunCase(trim, {-2, -1, 0, 1, 2}, -1.0f, 1.0f)));
+    EXPECT_TRUE(SameBitsArray({1, 1, -1}, RunCase(trim, {-2, 0, 2}, 1.0f, -1.0f)));
+    // A NaN element stays, a NaN bound disables its side, signed zeros stand.
+    EXPECT_TRUE(SameBitsArray({nan, -1, 1}, RunCase(trim, {nan, -5, 5}, -1.0f, 1.0f)));
+    EXPECT_TRUE(SameBitsArray({-5, 1}, RunCase(trim, {-5, 5}, nan, 1.0f)));
+    EXPECT_TRUE(SameBitsArray({-1, 5}, RunCase(trim, {-5, 5}, -1.0f, nan)));
+    EXPECT_TRUE(SameBitsArray({0.0f, -0.0f}, RunCase(trim, {0.0f, -0.0f}, -0.0f, 0.0f)));
 }
 
 // ---------------------------------------------------------------------------
@@ -284,65 +205,38 @@ TEST(TrimFloat, MatchesTheScalarRuleOnRandomData)
 TYPED_TEST(Thresholds, VectorSlopeTakesTheStartThenTheStep)
 {
     using T = TypeParam;
-    GuardedBuffer<T> dst(4);
+    GuardedBuffer<T> dst(9, T(-1));
     ku::VectorSlope(4u, dst.data(), T(1), T(0.5));
-    EXPECT_TRUE(SameBitsArray(std::vector<T>{T(1), T(1.5), T(2), T(2.5)}, dst.values()));
-    EXPECT_TRUE(dst.Intact());
-}
-
-TYPED_TEST(Thresholds, VectorSlopeOfZeroesIsPositiveZero)
-{
-    using T = TypeParam;
-    std::vector<T> dst(9, T(-1));
+    EXPECT_TRUE(SameBitsArray(std::vector<T>{T(1), T(1.5), T(2), T(2.5), T(-1)}, std::vector<T>(&dst[0], &dst[5])));
     ku::VectorSlope(9u, dst.data(), T(0), T(0));
-    EXPECT_TRUE(SameBitsArray(std::vector<T>(9, T(0)), dst));
+    EXPECT_TRUE(SameBitsArray(std::vector<T>(9, T(0)), dst.values()));
+    EXPECT_TRUE(dst.Intact());
+    // dst[3] is 3 * 0.1 rounded, plus 0: not three additions of 0.1.
+    ku::VectorSlope(4u, dst.data(), T(0), T(0.1));
+    EXPECT_TRUE(SameBits(T(T(3) * T(0.1)) + T(0), dst[3]));
 }
 
 TYPED_TEST(Thresholds, VectorSlopeComputesEachElementFromItsIndex)
 {
     using T = TypeParam;
     std::uint32_t seed = 2300;
-    for (unsigned int n : kestaccel_test::InterestingSizes()) {
+    bool driftSeen = false, fusedSeen = false;
+    for (unsigned int n : SizesFromZero()) {
         SCOPED_TRACE("size " + std::to_string(n) + " " + SeedTrace(seed));
         const auto params = RandomReals<T>(2, seed++, T(-100), T(100));
         const T offset = params[0], slope = params[1];
-        std::vector<T> expected(n);
-        for (unsigned int i = 0; i < n; ++i) {
-            const T product = static_cast<T>(i) * slope;
-            expected[i] = product + offset;
-        }
         GuardedBuffer<T> dst(n);
         ku::VectorSlope(n, dst.data(), offset, slope);
-        EXPECT_TRUE(SameBitsArray(expected, dst.values()));
         EXPECT_TRUE(dst.Intact());
+        T running = offset;
+        for (unsigned int i = 0; i < n; ++i, running = running + slope) {
+            const T product = static_cast<T>(i) * slope, expected = product + offset;
+            ASSERT_TRUE(SameBits(expected, dst[i])) << "index " << i;
+            driftSeen = driftSeen || Bits(running) != Bits(expected);
+            fusedSeen = fusedSeen || Bits(std::fma(static_cast<T>(i), slope, offset)) != Bits(expected);
+        }
     }
-}
-
-TEST(VectorSlopeFloat, NoDriftAndNoFusedStep)
-{
-    const unsigned int n = 4099;
-    const float slope = 0.1f, offset = 0.3f;
-    std::vector<float> dst(n);
-    ku::VectorSlope(n, dst.data(), offset, slope);
-    const float third = 3.0f * 0.1f;
-    EXPECT_TRUE(SameBits(third + 0.0f, [] {
-        float d[4];
-        ku::VectorSlope(4u, d, 0.0f, 0.1f);
-        return d[3];
-    }()));
-    // A running sum of the step and a fused multiply-add each differ from
-    // the two-rounding form somewhere on this ramp.
-    float running = offset;
-    bool driftSeen = false, fusedSeen = false;
-    for (unsigned int i = 0; i < n; ++i) {
-        const float product = static_cast<float>(i) * slope;
-        EXPECT_TRUE(SameBits(product + offset, dst[i])) << "index " << i;
-        driftSeen = driftSeen || Bits(running) != Bits(dst[i]);
-        fusedSeen = fusedSeen || Bits(std::fma(static_cast<float>(i), slope, offset)) != Bits(dst[i]);
-        running = running + slope;
-    }
-    EXPECT_TRUE(driftSeen);
-    EXPECT_TRUE(fusedSeen);
+    EXPECT_TRUE(driftSeen && fusedSeen) << "the data must tell a running sum and a fused step apart";
 }
 
 TEST(VectorSlopeFloat, IndexAbove2To24IsRoundedToFloat)
@@ -354,8 +248,7 @@ TEST(VectorSlopeFloat, IndexAbove2To24IsRoundedToFloat)
     ku::VectorSlope(n, dst.data(), offset, slope);
     bool widerIndexSeen = false;
     for (unsigned int i = (1u << 24) - 8u; i < n; ++i) {
-        const float index = static_cast<float>(i);
-        const float product = index * slope;
+        const float product = static_cast<float>(i) * slope;
         EXPECT_TRUE(SameBits(product + offset, dst[i])) << "index " << i;
         const float wide = static_cast<float>(static_cast<double>(i) * slope) + offset;
         widerIndexSeen = widerIndexSeen || Bits(wide) != Bits(dst[i]);
