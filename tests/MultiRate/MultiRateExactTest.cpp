@@ -52,6 +52,7 @@ TYPED_TEST_SUITE(MultiRateExact, ElementTypes);
 // cycles * (D - 1) input samples further on than a seamless stream would,
 // since inputIndex is rebased by cycleCount and not by the samples consumed;
 // at D = 1 its first windows reach into the history the first call left.
+// The reserved vector holds garbage: it is never read.
 TYPED_TEST(MultiRateExact, CallsMatchZeroStuffingModel)
 {
     using T = TypeParam;
@@ -64,7 +65,8 @@ TYPED_TEST(MultiRateExact, CallsMatchZeroStuffingModel)
         const std::int64_t consumed = std::int64_t(c.down) * c.cycles;
         // Both calls read past their cycles * D samples; the model sees the same samples.
         const auto x = RandomReals<T>(std::size_t(3 * consumed + 8), seed++);
-        MultiRateFilter<T> filter(c.up, c.down, taps, 1000, static_cast<unsigned int>(1000 + c.firstPosition));
+        MultiRateFilter<T> filter(c.up, c.down, taps, 1000, static_cast<unsigned int>(1000 + c.firstPosition),
+                                  PoolVector<T>(c.tapCount + 5, T(123.25)));
         const auto first = ProcessOnce(filter, c.up, x.data(), c.cycles);
         ProcessOnce(filter, c.up, x.data() + consumed, 0);
         const auto second = ProcessOnce(filter, c.up, x.data() + consumed, c.cycles);
@@ -102,7 +104,6 @@ TYPED_TEST(MultiRateExact, StreamingAtUnitDownFactorMatchesOneJointCall)
             streamed.Process(x.data() + in, out.data() + in * up, b);
             in += b;
         }
-        ASSERT_EQ(total, in);
         EXPECT_TRUE(SameBitsArray(expected, out.values()));
         EXPECT_TRUE(out.Intact());
     }
@@ -130,7 +131,8 @@ TYPED_TEST(MultiRateExact, SameSourceAndDestinationLeavesTheBufferAsItWas)
         ProcessOnce(separate, up, x.data() + in, cycles);
         in += cycles;
     }
-    EXPECT_TRUE(SameBitsArray(ProcessOnce(separate, up, x.data() + in, 50), ProcessOnce(inPlace, up, x.data() + in, 50)));
+    const auto expected = ProcessOnce(separate, up, x.data() + in, 50);
+    EXPECT_TRUE(SameBitsArray(expected, ProcessOnce(inPlace, up, x.data() + in, 50)));
 }
 
 TYPED_TEST(MultiRateExact, UnitFactorsReturnTheTapsForAnImpulse)
@@ -154,7 +156,7 @@ TYPED_TEST(MultiRateExact, OutputsLieWhereTheStartPositionSaysAndStepByD)
     using T = TypeParam;
     struct MarkerCase {
         unsigned int up, down, reference, start, cycles;
-        std::vector<double> expected;
+        std::vector<T> expected;
     };
     const MarkerCase cases[] = {
         // U = 2, D = 3 from position 0: m = 0, 3, 6, 9 are phase/inputIndex
@@ -172,8 +174,7 @@ TYPED_TEST(MultiRateExact, OutputsLieWhereTheStartPositionSaysAndStepByD)
     for (const MarkerCase& c : cases) {
         SCOPED_TRACE(::testing::Message() << "U=" << c.up << " D=" << c.down << " start=" << c.start);
         MultiRateFilter<T> filter(c.up, c.down, taps, c.reference, c.start);
-        EXPECT_TRUE(SameBitsArray(std::vector<T>(c.expected.begin(), c.expected.end()),
-                                  ProcessOnce(filter, c.up, x.data(), c.cycles)));
+        EXPECT_TRUE(SameBitsArray(c.expected, ProcessOnce(filter, c.up, x.data(), c.cycles)));
     }
 }
 
@@ -190,17 +191,6 @@ TYPED_TEST(MultiRateExact, OneTapAddsTheProductToPositiveZero)
     const auto out = ProcessOnce(filter, 1, x.data(), 13);
     EXPECT_TRUE(SameBitsArray(ZeroStuffedOutputs(x, taps, 1, 1, 0, 13), out));
     for (std::size_t n : {0, 1, 8, 9, 12}) EXPECT_TRUE(SameBits(T(0), out[n])) << "at " << n;
-}
-
-TYPED_TEST(MultiRateExact, ReservedVectorIsNeverRead)
-{
-    using T = TypeParam;
-    const std::uint32_t seed = 605;
-    SCOPED_TRACE(SeedTrace(seed));
-    const auto taps = RandomReals<T>(24, seed);
-    const auto x = RandomReals<T>(30, seed + 1);
-    MultiRateFilter<T> plain(3, 2, taps, 0, 0), withReserved(3, 2, taps, 0, 0, PoolVector<T>(24, T(123.25)));
-    EXPECT_TRUE(SameBitsArray(ProcessOnce(plain, 3, x.data(), 15), ProcessOnce(withReserved, 3, x.data(), 15)));
 }
 
 }  // namespace
