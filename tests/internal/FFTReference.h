@@ -9,6 +9,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <utility>
 #include <vector>
 
 #include "transform/FFT/FFTPlan.h"
@@ -29,11 +30,7 @@ void Forward(const FFTPlan<E>& plan, E* data)
     const std::uint32_t n = plan.size;
     for (std::uint32_t i = 0; i <= n - 2; ++i) {
         const std::uint32_t p = plan.swapTable[i];
-        if (p != i) {
-            const Pair<E> t = a[i];
-            a[i] = a[p];
-            a[p] = t;
-        }
+        if (p != i) std::swap(a[i], a[p]);
     }
     for (std::uint32_t i = 0; i < n; i += 2) {
         const Pair<E> x = a[i], y = a[i + 1];
