@@ -19,13 +19,7 @@
 namespace {
 
 namespace ku = kestaccel::utility;
-using kestaccel_test::Bits;
-using kestaccel_test::FromBits;
-using kestaccel_test::GuardedBuffer;
-using kestaccel_test::RandomComplex;
-using kestaccel_test::SameBits;
-using kestaccel_test::SameBitsArray;
-using kestaccel_test::SeedTrace;
+using namespace kestaccel_test;
 
 // Gaps that stay gaps: the complex family has no AddConstantProduct, no
 // DivConstantRev and no scaled MulConstant_InPlace. Each detector is shown to
@@ -47,7 +41,7 @@ static_assert(!HasAddConstantProduct<std::complex<float>>::value && !HasAddConst
 template <class T>
 T QuietNaN(std::uint32_t payload = 0)
 {
-    using B = kestaccel_test::BitsType<T>;
+    using B = BitsType<T>;
     return FromBits<T>((sizeof(T) == 4 ? B(0x7FC00000u) : B(0x7FF8000000000000ull)) | B(payload));
 }
 
@@ -162,7 +156,7 @@ TYPED_TEST(ComplexArithmetic, MembersMatchTheirDefinitions)
     const T inf = std::numeric_limits<T>::infinity();
     const Z constants[] = {{T(0.7), T(-1.3)}, {T(1), T(-1)},  {T(-2), T(2)},     {T(3), T(0.25)},
                            {inf, T(1)},       {T(0), T(2.5)}, {T(1e-20), T(0)}, {T(0), QuietNaN<T>(7)}};
-    const auto& sizes = kestaccel_test::InterestingSizes();
+    const auto& sizes = InterestingSizes();
     std::uint32_t seed = 700;
     for (const auto& c : cases) {
         for (std::size_t s = 0; s < sizes.size(); ++s) {

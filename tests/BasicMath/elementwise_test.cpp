@@ -26,14 +26,7 @@ extern "C" float __cdecl _hypotf(float x, float y);
 namespace {
 
 namespace ku = kestaccel::utility;
-using kestaccel_test::Bits;
-using kestaccel_test::FromBits;
-using kestaccel_test::GuardedBuffer;
-using kestaccel_test::RandomComplex;
-using kestaccel_test::RandomReals;
-using kestaccel_test::SameBits;
-using kestaccel_test::SameBitsArray;
-using kestaccel_test::SeedTrace;
+using namespace kestaccel_test;
 
 // Gaps that stay gaps. Each detector is first shown to see the member that
 // does exist, so that a false answer means something.
@@ -85,16 +78,14 @@ struct Runtime {
 template <class T>
 T NegativeNaN()
 {
-    using B = kestaccel_test::BitsType<T>;
-    return FromBits<T>(sizeof(T) == 4 ? B(0xFFC00123u) : B(0xFFF8000000000123ull));
+    return FromBits<T>(sizeof(T) == 4 ? BitsType<T>(0xFFC00123u) : BitsType<T>(0xFFF8000000000123ull));
 }
 
 // What Abs_InPlace does: the sign bit cleared, whatever the value.
 template <class T>
 T ClearSign(T x)
 {
-    using B = kestaccel_test::BitsType<T>;
-    return FromBits<T>(Bits(x) & ~(B(1) << (8 * sizeof(T) - 1)));
+    return FromBits<T>(Bits(x) & ~(BitsType<T>(1) << (8 * sizeof(T) - 1)));
 }
 
 // Random values with the specials every function must pass through.
@@ -116,45 +107,45 @@ TYPED_TEST_SUITE(Elementwise, FloatingTypes);
 
 constexpr unsigned int kRuntimeSamples = 4000;
 
-// T comes from the input alone (common_type_t is not deduced), so that an
-// overloaded member or a lambda converts to these.
-template <class T>
-using Unary = void (*)(unsigned int, const std::common_type_t<T>*, std::common_type_t<T>*);
-template <class T>
-using InPlace = void (*)(unsigned int, std::common_type_t<T>*);
+// A member of the library as a callable whose element type picks the overload.
+#define MEMBER(f) [](auto... a) -> decltype(ku::f(a...)) { ku::f(a...); }
 
-// dst[i] against ref(src[i]) bit for bit, with the sentinel, and count 0
-// writing nothing; the same for each form given. With dst one
-// element ahead of src, each index reads the value written at the one before;
-// one behind, nothing is read twice: the plain ascending loop, which a
-// vectorised body must not change.
-template <class T, class Ref>
-void ExpectMatches(const std::vector<T>& in, Ref ref, Unary<T> run, InPlace<T> runInPlace = nullptr)
+// out[i] against ref(in[i]) (or ref(in[i], i)) bit for bit, with the sentinel
+// and count 0 writing nothing; `member` takes (count, src, dst) or, run on a
+// copy of the input, (count, srcDst). Where it reads and writes one type, dst
+// one element ahead of src reads at each index the value written at the one
+// before, and one element behind reads nothing twice: the plain ascending
+// loop, which a vectorised body must not change.
+template <class E, class Ref, class Member>
+void ExpectMatches(const std::vector<E>& in, Ref ref, Member member)
 {
+    const auto at = [&ref](E x, std::size_t i) {
+        if constexpr (std::is_invocable<Ref, E, std::size_t>::value) return ref(x, i);
+        else return ref(x);
+    };
+    using D = decltype(at(E(), 0));
+    constexpr bool inPlace = std::is_invocable<Member, unsigned int, E*>::value;
     const auto n = static_cast<unsigned int>(in.size());
-    std::vector<T> expected(n);
-    std::transform(in.begin(), in.end(), expected.begin(), ref);
-    GuardedBuffer<T> dst(n), srcDst(n), none(0);
-    std::copy(in.begin(), in.end(), srcDst.data());
-    if (run) {
-        run(n, in.data(), dst.data());
-        run(0, nullptr, none.data());
-        EXPECT_TRUE(SameBitsArray(expected.data(), dst.data(), n));
+    GuardedBuffer<D> out(n), none(0);
+    if constexpr (inPlace) {
+        std::copy(in.begin(), in.end(), out.data());
+        member(n, out.data());
+        member(0u, none.data());
+    } else {
+        member(n, in.data(), out.data());
+        member(0u, static_cast<const E*>(nullptr), none.data());
     }
-    if (runInPlace) {
-        runInPlace(n, srcDst.data());
-        runInPlace(0, none.data());
-        EXPECT_TRUE(SameBitsArray(expected.data(), srcDst.data(), n)) << "in place";
-    }
-    EXPECT_TRUE(dst.Intact() && srcDst.Intact() && none.Intact());
-    for (const std::size_t ahead : {1, 0}) {
-        if (!run) break;
-        std::vector<T> buffer(in), chained(in);
-        buffer.push_back(T(0.75));
-        chained.push_back(T(0.75));
-        for (std::size_t i = 0; i < n; ++i) chained[i + ahead] = ref(chained[i + 1 - ahead]);
-        run(n, buffer.data() + 1 - ahead, buffer.data() + ahead);
-        EXPECT_TRUE(SameBitsArray(chained, buffer)) << (ahead ? "dst one element ahead" : "dst one element behind");
+    for (std::size_t i = 0; i < n; ++i) ASSERT_TRUE(SameBits(at(in[i], i), out[i])) << "at index " << i << " of " << n;
+    EXPECT_TRUE(out.Intact() && none.Intact());
+    if constexpr (!inPlace && std::is_same<D, E>::value) {
+        for (const std::size_t ahead : {1, 0}) {
+            std::vector<E> buffer(in);
+            buffer.push_back(E(0.75));
+            auto chained = buffer;
+            for (std::size_t i = 0; i < n; ++i) chained[i + ahead] = at(chained[i + 1 - ahead], i);
+            member(n, buffer.data() + 1 - ahead, buffer.data() + ahead);
+            EXPECT_TRUE(SameBitsArray(chained, buffer)) << (ahead ? "dst one element ahead" : "dst one element behind");
+        }
     }
 }
 
@@ -167,62 +158,73 @@ TYPED_TEST(Elementwise, RuntimeFunctionsOfTheirPrecision)
     const std::uint32_t seed = 1100;
     SCOPED_TRACE(SeedTrace(seed));
     const auto exponents = WithSpecials(RandomReals<T>(kRuntimeSamples, seed, T(-100), T(100)));
-    ExpectMatches<T>(exponents, R::Exp, ku::Exp, ku::Exp_InPlace);
-    ExpectMatches<T>(exponents, R::Round, ku::Round);
-    ExpectMatches<T>(exponents, R::Sqrt, ku::Sqrt);
+    ExpectMatches(exponents, R::Exp, MEMBER(Exp));
+    ExpectMatches(exponents, R::Exp, MEMBER(Exp_InPlace));
+    ExpectMatches(exponents, R::Round, MEMBER(Round));
 
     // Logarithms over many decades, and the negative numbers that give NaN.
     auto logs = RandomReals<T>(kRuntimeSamples, seed + 1, T(-30), T(30));
     for (std::size_t i = 0; i < logs.size(); ++i) logs[i] = (i % 17 == 3 ? T(-1) : T(1)) * std::pow(T(10), logs[i]);
     logs = WithSpecials(logs);
-    ExpectMatches<T>(logs, R::Log, ku::Ln);
+    ExpectMatches(logs, R::Log, MEMBER(Ln));
     if constexpr (std::is_same<T, float>::value) {  // every Ln name gives the bits of logf
-        ExpectMatches<T>(logs, R::Log, ku::Ln_Prec11);
-        ExpectMatches<T>(logs, R::Log, ku::Ln_Prec21);
-        ExpectMatches<T>(logs, R::Log, ku::Ln_Prec24, ku::Ln_InPlace);
+        ExpectMatches(logs, R::Log, MEMBER(Ln_Prec11));
+        ExpectMatches(logs, R::Log, MEMBER(Ln_Prec21));
+        ExpectMatches(logs, R::Log, MEMBER(Ln_Prec24));
+        ExpectMatches(logs, R::Log, MEMBER(Ln_InPlace));
     }
 
     // Pow takes the first vector as the base; a negative base with an
     // integral exponent has a real power.
     auto base = WithSpecials(RandomReals<T>(kRuntimeSamples, seed + 2, T(0), T(50)));
     auto exponent = RandomReals<T>(kRuntimeSamples, seed + 3, T(-12), T(12));
-    for (std::size_t i = 0; i < base.size(); i += 13) {
-        base[i] = -base[i];
-        exponent[i] = std::round(exponent[i]);
-    }
-    std::vector<T> expected(kRuntimeSamples);
-    std::transform(base.begin(), base.end(), exponent.begin(), expected.begin(), R::Pow);
-    GuardedBuffer<T> dst(kRuntimeSamples), prec(kRuntimeSamples), none(0);
-    ku::Pow(kRuntimeSamples, base.data(), exponent.data(), dst.data());
-    ku::Pow(0, base.data(), exponent.data(), none.data());
-    EXPECT_TRUE(SameBitsArray(expected.data(), dst.data(), kRuntimeSamples));
-    if constexpr (std::is_same<T, double>::value) {
-        ku::Pow_Prec26(kRuntimeSamples, base.data(), exponent.data(), prec.data());
-        EXPECT_TRUE(SameBitsArray(expected.data(), prec.data(), kRuntimeSamples));
-    }
-    EXPECT_TRUE(dst.Intact() && prec.Intact() && none.Intact());
+    for (std::size_t i = 0; i < base.size(); i += 13) base[i] = -base[i], exponent[i] = std::round(exponent[i]);
+    const auto power = [&](T x, std::size_t i) { return R::Pow(x, exponent[i]); };
+    ExpectMatches(base, power, [&](unsigned int n, const T* a, T* d) { ku::Pow(n, a, exponent.data(), d); });
+    if constexpr (std::is_same<T, double>::value)
+        ExpectMatches(base, power, [&](unsigned int n, const T* a, T* d) { ku::Pow_Prec26(n, a, exponent.data(), d); });
 }
 
 // The plain passes over every size, against the definition written here.
 TYPED_TEST(Elementwise, PlainPassesOverEverySize)
 {
     using T = TypeParam;
+    using Z = std::complex<T>;
     std::uint32_t seed = 1300;
-    for (unsigned int n : kestaccel_test::InterestingSizes()) {
+    for (unsigned int n : InterestingSizes()) {
         SCOPED_TRACE("size " + std::to_string(n) + " " + SeedTrace(seed));
         const auto in = WithSpecials(RandomReals<T>(n, seed++, T(-1e3), T(1e3)));
         const auto square = [](T x) { return x * x; };
         const auto inverse = [](T x) { return T(1) / x; };
-        ExpectMatches<T>(in, square, ku::Sqr, ku::Sqr_InPlace);
-        ExpectMatches<T>(in, Runtime<T>::Sqrt, ku::Sqrt, ku::Sqrt_InPlace);
-        ExpectMatches<T>(in, inverse, ku::Inverse);
-        if constexpr (std::is_same<T, double>::value) ExpectMatches<T>(in, inverse, ku::Inverse_Prec26);
+        ExpectMatches(in, square, MEMBER(Sqr));
+        ExpectMatches(in, square, MEMBER(Sqr_InPlace));
+        ExpectMatches(in, Runtime<T>::Sqrt, MEMBER(Sqrt));
+        ExpectMatches(in, Runtime<T>::Sqrt, MEMBER(Sqrt_InPlace));
+        ExpectMatches(in, inverse, MEMBER(Inverse));
+        if constexpr (std::is_same<T, double>::value) ExpectMatches(in, inverse, MEMBER(Inverse_Prec26));
         // Abs tests 0 > x; Abs_InPlace clears the sign bit unconditionally.
-        ExpectMatches<T>(in, [](T x) { return T(0) > x ? -x : x; }, ku::Abs);
-        ExpectMatches<T>(in, ClearSign<T>, nullptr, ku::Abs_InPlace);
+        ExpectMatches(in, [](T x) { return T(0) > x ? -x : x; }, MEMBER(Abs));
+        ExpectMatches(in, ClearSign<T>, MEMBER(Abs_InPlace));
         // Subtract and round, then divide: offset and divisor in that order.
-        ExpectMatches<T>(in, [](T x) { return (x - T(0.3)) / T(-1.7); },
-                         [](unsigned int k, const T* s, T* d) { ku::Normalize(k, s, d, T(0.3), T(-1.7)); });
+        ExpectMatches(in, [](T x) { return (x - T(0.3)) / T(-1.7); },
+                      [](unsigned int k, const T* s, T* d) { ku::Normalize(k, s, d, T(0.3), T(-1.7)); });
+
+        // The hypotenuse of the runtime, split and joined, where the sum of
+        // squares of the power spectrum overflows.
+        auto z = RandomComplex<T>(n, seed++, T(-1e3), T(1e3));
+        z[n / 2] = {sizeof(T) == 4 ? T(3e19) : T(3e154), 0};
+        std::vector<T> re(n), im(n);
+        for (std::size_t i = 0; i < n; ++i) re[i] = z[i].real(), im[i] = z[i].imag();
+        ExpectMatches(re, [&](T x, std::size_t i) { return Runtime<T>::Hypot(x, im[i]); },
+                      [&](unsigned int k, const T* s, T* d) { ku::Magnitude(k, s, im.data(), d); });
+        ExpectMatches(z, [](Z v) { return Runtime<T>::Hypot(v.real(), v.imag()); }, MEMBER(Magnitude));
+        ExpectMatches(z, [](Z v) { return v.real() * v.real() + v.imag() * v.imag(); }, MEMBER(PowerSpectr));
+        // Over its own source, value i lands on a component already read.
+        ku::PowerSpectr(n, z.data(), reinterpret_cast<T*>(z.data()));
+        for (std::size_t j = 0; j < 2 * n; ++j) {
+            const T expected = j < n ? re[j] * re[j] + im[j] * im[j] : (j % 2 ? im[j / 2] : re[j / 2]);
+            ASSERT_TRUE(SameBits(expected, reinterpret_cast<const T*>(z.data())[j])) << "PowerSpectr over its source at " << j;
+        }
 
         // Flip copies forward, Flip_InPlace swaps; one element ahead of its
         // source Flip reads back what it wrote, as the forward loop does.
@@ -233,48 +235,20 @@ TYPED_TEST(Elementwise, PlainPassesOverEverySize)
         ku::Flip_InPlace(n, srcDst.data());
         ku::Flip(0, in.data(), none.data());
         ku::Flip_InPlace(0, none.data());
-        EXPECT_TRUE(SameBitsArray(reversed.data(), dst.data(), n));
-        EXPECT_TRUE(SameBitsArray(reversed.data(), srcDst.data(), n));
+        EXPECT_TRUE(SameBitsArray(reversed.data(), dst.data(), n) && SameBitsArray(reversed.data(), srcDst.data(), n));
         EXPECT_TRUE(dst.Intact() && srcDst.Intact() && none.Intact());
-        std::vector<T> ahead = in, aheadExpected = in;
+        std::vector<T> ahead = in;
         ahead.push_back(T(0.75));
-        aheadExpected.push_back(T(0.75));
+        auto aheadExpected = ahead;
         for (std::size_t i = 0; i < n; ++i) aheadExpected[1 + i] = aheadExpected[n - 1 - i];
         ku::Flip(n, ahead.data(), ahead.data() + 1);
-        EXPECT_TRUE(SameBitsArray(aheadExpected, ahead));
-
-        // The hypotenuse of the runtime, split and joined, and the sum of
-        // squares, also written over its own complex source,
-        // where value i lands on a component already read.
-        auto z = RandomComplex<T>(n, seed++, T(-1e3), T(1e3));
-        z[n / 2] = {sizeof(T) == 4 ? T(3e19) : T(3e154), 0};  // the hypotenuse survives, the sum overflows
-        std::vector<T> re(n), im(n);
-        for (std::size_t i = 0; i < n; ++i) re[i] = z[i].real(), im[i] = z[i].imag();
-        GuardedBuffer<T> split(n), joined(n), spectrum(n);
-        ku::Magnitude(n, re.data(), im.data(), split.data());
-        ku::Magnitude(n, z.data(), joined.data());
-        ku::PowerSpectr(n, z.data(), spectrum.data());
-        ku::Magnitude(0, re.data(), im.data(), none.data());
-        ku::Magnitude(0, z.data(), none.data());
-        ku::PowerSpectr(0, z.data(), none.data());
-        ku::PowerSpectr(n, z.data(), reinterpret_cast<T*>(z.data()));
-        for (std::size_t i = 0; i < n; ++i) {
-            const T hyp = Runtime<T>::Hypot(re[i], im[i]), power = re[i] * re[i] + im[i] * im[i];
-            ASSERT_TRUE(SameBits(hyp, split[i]) && SameBits(hyp, joined[i])) << "Magnitude at " << i;
-            ASSERT_TRUE(SameBits(power, spectrum[i])) << "PowerSpectr at " << i;
-        }
-        for (std::size_t j = 0; j < 2 * n; ++j) {
-            const T expected = j < n ? re[j] * re[j] + im[j] * im[j] : (j % 2 ? im[j / 2] : re[j / 2]);
-            ASSERT_TRUE(SameBits(expected, reinterpret_cast<const T*>(z.data())[j])) << "PowerSpectr over its source at " << j;
-        }
-        EXPECT_TRUE(split.Intact() && joined.Intact() && spectrum.Intact() && none.Intact());
+        EXPECT_TRUE(SameBitsArray(aheadExpected, ahead)) << "Flip one element ahead";
     }
 }
 
 TYPED_TEST(Elementwise, HandWorkedValues)
 {
     using T = TypeParam;
-    const T inf = std::numeric_limits<T>::infinity();
     const T two = 2, ten = 10, five = 5;
     T out = 0;
     ku::Pow(1, &two, &ten, &out);
@@ -282,7 +256,7 @@ TYPED_TEST(Elementwise, HandWorkedValues)
     ku::Normalize(1, &five, &out, T(1), T(2));
     EXPECT_TRUE(SameBits(T(2), out));
     ku::Normalize(1, &five, &out, T(0), T(0));
-    EXPECT_TRUE(SameBits(inf, out)) << "no zero test on the divisor";
+    EXPECT_TRUE(SameBits(std::numeric_limits<T>::infinity(), out)) << "no zero test on the divisor";
 
     // The ties of round: away from zero, and -0.4 keeps its sign.
     const std::vector<T> ties = {T(1.5), T(2.5), T(-1.5), T(-2.5), T(0.5), T(-0.4)};
@@ -336,17 +310,18 @@ TEST(ElementwiseFloat, PolarConversionsUseTheFloatRuntime)
     // (0, 1), (-1, 0) and a pair whose squares overflow single precision,
     // which Magnitude survives.
     const float pairs[] = {0.0f, 1.0f, -1.0f, 0.0f, 3e19f, 0.0f};
-    const float pi = 3.14159265358979323846f;
+    const float pi = 3.14159265358979323846f, magnitudes[] = {1.0f, 1.0f, std::numeric_limits<float>::infinity()};
     float m[3], p[3], hyp = 0;
     ku::CartToPolar(3, pairs, m, p);
     ku::Magnitude(1, &pairs[4], &pairs[5], &hyp);
-    const float magnitudes[] = {1.0f, 1.0f, std::numeric_limits<float>::infinity()};
     EXPECT_TRUE(SameBitsArray(magnitudes, m, 3));
     EXPECT_TRUE(SameBits(pi / 2, p[0]) && SameBits(pi, p[1]));
     EXPECT_TRUE(SameBits(3e19f, hyp));
 }
 
-// The real threshold written out from its definition.
+// Both thresholds written out from their definitions. The real one tests the
+// size of x, but at or below epsilon x itself; the complex one tests the
+// squared magnitude (widened to double for float), keeping the phase.
 template <class T>
 T InvertedWithThreshold(T x, T threshold)
 {
@@ -358,98 +333,65 @@ T InvertedWithThreshold(T x, T threshold)
     return T(-1) / threshold;
 }
 
-TYPED_TEST(Elementwise, RealInvertThreshold)
+template <class T>
+std::complex<T> InvertedWithThreshold(std::complex<T> z, T threshold)
+{
+    const T re = z.real(), im = z.imag(), p = im * im + re * re;
+    if (static_cast<double>(p) <= static_cast<double>(std::numeric_limits<T>::epsilon())) return {T(1) / threshold, T(0)};
+    const T m = threshold * threshold > p ? std::sqrt(p) * threshold : p;
+    return {re / m, -im / m};
+}
+
+TYPED_TEST(Elementwise, InvertThreshold)
 {
     using T = TypeParam;
+    using Z = std::complex<T>;
     const T inf = std::numeric_limits<T>::infinity(), nan = std::numeric_limits<T>::quiet_NaN();
     const std::vector<T> hand = {2, T(0.25), T(-0.25), 0, -2};
     std::vector<T> out = hand, tiny = {-3, 0, 2}, unlimited = hand;
     ku::Invert_Threshold_InPlace(5, out.data(), T(0.5));
     EXPECT_TRUE(SameBitsArray(std::vector<T>{T(0.5), 2, -2, 2, T(-0.5)}, out));
-    // At or below epsilon the test is on x: negatives go to +infinity.
     ku::Invert_Threshold_InPlace(3, tiny.data(), T(1e-20));
-    EXPECT_TRUE(SameBitsArray(std::vector<T>{inf, inf, T(0.5)}, tiny));
-    for (const T threshold : {T(0), -T(0), T(-1)}) {
-        std::vector<T> same = hand;
-        ku::Invert_Threshold_InPlace(5, same.data(), threshold);
-        EXPECT_TRUE(SameBitsArray(hand, same));
-    }
+    EXPECT_TRUE(SameBitsArray(std::vector<T>{inf, inf, T(0.5)}, tiny)) << "negatives go to +infinity";
     // A NaN threshold passes the early test; no size reaches it, so every
     // element becomes one of the NaN limits.
     ku::Invert_Threshold_InPlace(5, unlimited.data(), nan);
     for (const T x : unlimited) EXPECT_TRUE(std::isnan(x));
 
+    // A tiny complex element in any direction gives (top, +0); a NaN one stays NaN.
+    std::vector<Z> zs = {{T(0.25), 0}, {0, 0}, {2, 0}, {-T(1e-30), -T(1e-30)}, {nan, 1}};
+    ku::Invert_Threshold_InPlace(5, zs.data(), T(0.5));
+    EXPECT_TRUE(SameBitsArray(std::vector<Z>{{2, -T(0)}, {2, T(0)}, {T(0.5), -T(0)}, {2, T(0)}}, std::vector<Z>(zs.begin(), zs.begin() + 4)));
+    EXPECT_TRUE(std::isnan(zs[4].real()) && std::isnan(zs[4].imag()));
+    // With a NaN threshold limit > p fails, so a normal element takes the
+    // unlimited inverse.
+    std::vector<Z> zUnlimited = {{2, 0}, {0, 0}};
+    ku::Invert_Threshold_InPlace(2, zUnlimited.data(), nan);
+    EXPECT_TRUE(SameBits(Z(T(0.5), -T(0)), zUnlimited[0]));
+    EXPECT_TRUE(std::isnan(zUnlimited[1].real()) && SameBits(T(0), zUnlimited[1].imag()));
+
+    // A zero or negative threshold changes nothing.
+    const auto original = RandomComplex<T>(16, 2090);
+    for (const T threshold : {T(0), -T(0), T(-1)}) {
+        std::vector<T> same = hand;
+        auto zSame = original;
+        ku::Invert_Threshold_InPlace(5, same.data(), threshold);
+        ku::Invert_Threshold_InPlace(16, zSame.data(), threshold);
+        EXPECT_TRUE(SameBitsArray(hand, same) && SameBitsArray(original, zSame)) << threshold;
+    }
+
     std::uint32_t seed = 2000;
     const T eps = std::numeric_limits<T>::epsilon();
-    for (const T threshold : {T(0.75), T(3), eps, eps / 4, T(2) * eps}) {
-        SCOPED_TRACE(::testing::Message() << "threshold " << threshold << " " << SeedTrace(seed));
-        auto in = WithSpecials(RandomReals<T>(1000, seed++, T(-4), T(4)));
-        for (std::size_t i = 0; i < in.size(); i += 7) in[i] *= (i % 2 ? eps : T(1e-3));
-        std::vector<T> expected(in.size());
-        for (std::size_t i = 0; i < in.size(); ++i) expected[i] = InvertedWithThreshold(in[i], threshold);
-        GuardedBuffer<T> srcDst(in.size()), none(0);
-        std::copy(in.begin(), in.end(), srcDst.data());
-        ku::Invert_Threshold_InPlace(1000, srcDst.data(), threshold);
-        ku::Invert_Threshold_InPlace(0, none.data(), threshold);
-        EXPECT_TRUE(SameBitsArray(expected.data(), srcDst.data(), in.size()));
-        EXPECT_TRUE(srcDst.Intact() && none.Intact());
-    }
-}
-
-template <class T>
-std::complex<T> ComplexInvertedWithThreshold(std::complex<T> z, T threshold)
-{
-    const T re = z.real(), im = z.imag();
-    const T p = im * im + re * re;
-    if (static_cast<double>(p) <= static_cast<double>(std::numeric_limits<T>::epsilon())) return {T(1) / threshold, T(0)};
-    const T limit = threshold * threshold;
-    if (limit > p) {
-        const T m = std::sqrt(p) * threshold;
-        return {re / m, -im / m};
-    }
-    return {re / p, -im / p};
-}
-
-TYPED_TEST(Elementwise, ComplexInvertThreshold)
-{
-    using T = TypeParam;
-    using Z = std::complex<T>;
-    const T nan = std::numeric_limits<T>::quiet_NaN();
-    std::vector<Z> hand = {{T(0.25), 0}, {0, 0}, {2, 0}, {-T(1e-30), -T(1e-30)}}, nanElement = {{nan, 1}};
-    ku::Invert_Threshold_InPlace(4, hand.data(), T(0.5));
-    // A tiny element in any direction gives (top, +0).
-    EXPECT_TRUE(SameBitsArray(std::vector<Z>{{2, -T(0)}, {2, T(0)}, {T(0.5), -T(0)}, {2, T(0)}}, hand));
-    ku::Invert_Threshold_InPlace(1, nanElement.data(), T(0.5));
-    EXPECT_TRUE(std::isnan(nanElement[0].real()) && std::isnan(nanElement[0].imag()));
-
-    // A NaN threshold passes the early test; limit > p then fails, so a
-    // normal element takes the unlimited inverse.
-    std::vector<Z> unlimited = {{2, 0}, {0, 0}};
-    ku::Invert_Threshold_InPlace(2, unlimited.data(), nan);
-    EXPECT_TRUE(SameBits(Z(T(0.5), -T(0)), unlimited[0]));
-    EXPECT_TRUE(std::isnan(unlimited[1].real()) && SameBits(T(0), unlimited[1].imag()));
-
-    const auto original = RandomComplex<T>(16, 2090);
-    for (const T threshold : {T(0), T(-2)}) {
-        auto same = original;
-        ku::Invert_Threshold_InPlace(16, same.data(), threshold);
-        EXPECT_TRUE(SameBitsArray(original, same));
-    }
-
-    std::uint32_t seed = 2100;
-    for (const T threshold : {T(0.6), T(1e-3), T(7)}) {
-        for (unsigned int n : kestaccel_test::InterestingSizes()) {
+    for (const T threshold : {T(0.75), T(3), eps, eps / 4, T(2) * eps, T(0.6), T(1e-3), T(7)}) {
+        for (unsigned int n : InterestingSizes()) {
             SCOPED_TRACE(::testing::Message() << "threshold " << threshold << " size " << n << " " << SeedTrace(seed));
-            auto in = RandomComplex<T>(n, seed++, T(-2), T(2));
-            for (std::size_t i = 0; i < n; i += 5) in[i] *= T(1e-4);
-            std::vector<Z> expected(n);
-            for (std::size_t i = 0; i < n; ++i) expected[i] = ComplexInvertedWithThreshold(in[i], threshold);
-            GuardedBuffer<Z> srcDst(n), none(0);
-            std::copy(in.begin(), in.end(), srcDst.data());
-            ku::Invert_Threshold_InPlace(n, srcDst.data(), threshold);
-            ku::Invert_Threshold_InPlace(0, none.data(), threshold);
-            EXPECT_TRUE(SameBitsArray(expected.data(), srcDst.data(), n));
-            EXPECT_TRUE(srcDst.Intact() && none.Intact());
+            auto in = WithSpecials(RandomReals<T>(n, seed++, T(-4), T(4)));
+            for (std::size_t i = 0; i < n; i += 7) in[i] *= (i % 2 ? eps : T(1e-3));
+            auto zIn = RandomComplex<T>(n, seed++, T(-2), T(2));
+            for (std::size_t i = 0; i < n; i += 5) zIn[i] *= T(1e-4);
+            const auto run = [threshold](unsigned int k, auto* io) { ku::Invert_Threshold_InPlace(k, io, threshold); };
+            ExpectMatches(in, [threshold](T x) { return InvertedWithThreshold(x, threshold); }, run);
+            ExpectMatches(zIn, [threshold](Z z) { return InvertedWithThreshold(z, threshold); }, run);
         }
     }
 }
