@@ -101,7 +101,7 @@ TEST(FIR, BlockSplitsMatchOnePass)
 {
     const std::vector<unsigned int> splits[] = {{512}, {256, 256}, {1, 3, 35, 36, 37, 8, 0, 600, 2, 1000, 1272}};
     for (const auto& split : splits) {
-        const std::uint32_t seed = 77 + static_cast<std::uint32_t>(split.size());
+        const std::uint32_t seed = split.size() > 2 ? 78 : 77;  // 512 and 256 + 256 on the same data
         SCOPED_TRACE(SeedTrace(seed));
         PlainFIR plain{RandomReals<float>(37, seed), RandomReals<float>(36, seed + 1)};
         Filter filter(plain.taps, plain.history.data());
