@@ -61,27 +61,24 @@ struct ThresholdCase {
 template <class T>
 std::vector<ThresholdCase<T>> ThresholdCases()
 {
-    using R = std::function<T(T, T, T)>;
-    const R lt = [](T x, T level, T) { return level > x ? level : x; };
-    const R gt = [](T x, T level, T) { return level < x ? level : x; };
-    const R ltVal = [](T x, T level, T value) { return level > x ? value : x; };
-    const R gtVal = [](T x, T level, T value) { return x > level ? value : x; };
     std::vector<ThresholdCase<T>> cases = {
-        {"Threshold_LT_InPlace", true,
-         [](unsigned int n, T* d, const T*, T l, T) { ku::Threshold_LT_InPlace(n, d, l); }, lt},
-        {"Threshold_GT_InPlace", true,
-         [](unsigned int n, T* d, const T*, T l, T) { ku::Threshold_GT_InPlace(n, d, l); }, gt},
-        {"Threshold_LTVal", false,
-         [](unsigned int n, T* d, const T* s, T l, T v) { ku::Threshold_LTVal(n, s, d, l, v); }, ltVal},
+        {"Threshold_LT_InPlace", true, [](auto n, T* d, const T*, T l, T) { ku::Threshold_LT_InPlace(n, d, l); },
+         [](T x, T level, T) { return level > x ? level : x; }},
+        {"Threshold_GT_InPlace", true, [](auto n, T* d, const T*, T l, T) { ku::Threshold_GT_InPlace(n, d, l); },
+         [](T x, T level, T) { return level < x ? level : x; }},
+        {"Threshold_LTVal", false, [](auto n, T* d, const T* s, T l, T v) { ku::Threshold_LTVal(n, s, d, l, v); },
+         [](T x, T level, T value) { return level > x ? value : x; }},
         {"Threshold_LTVal_InPlace", true,
-         [](unsigned int n, T* d, const T*, T l, T v) { ku::Threshold_LTVal_InPlace(n, d, l, v); }, ltVal},
-        {"Threshold_GTVal", false,
-         [](unsigned int n, T* d, const T* s, T l, T v) { ku::Threshold_GTVal(n, s, d, l, v); }, gtVal},
+         [](auto n, T* d, const T*, T l, T v) { ku::Threshold_LTVal_InPlace(n, d, l, v); },
+         [](T x, T level, T value) { return level > x ? value : x; }},
+        {"Threshold_GTVal", false, [](auto n, T* d, const T* s, T l, T v) { ku::Threshold_GTVal(n, s, d, l, v); },
+         [](T x, T level, T value) { return x > level ? value : x; }},
         {"Threshold_GTVal_InPlace", true,
-         [](unsigned int n, T* d, const T*, T l, T v) { ku::Threshold_GTVal_InPlace(n, d, l, v); }, gtVal},
+         [](auto n, T* d, const T*, T l, T v) { ku::Threshold_GTVal_InPlace(n, d, l, v); },
+         [](T x, T level, T value) { return x > level ? value : x; }},
     };
     if constexpr (std::is_same<T, float>::value)
-        cases.push_back({"Trim", true, [](unsigned int n, T* d, const T*, T low, T high) { ku::Trim(n, d, low, high); },
+        cases.push_back({"Trim", true, [](auto n, T* d, const T*, T low, T high) { ku::Trim(n, d, low, high); },
                          [](T x, T low, T high) { return low > x ? low : (high < x ? high : x); }});
     return cases;
 }
@@ -102,29 +99,21 @@ std::vector<T> RunCase(const ThresholdCase<T>& c, const std::vector<T>& src, T l
     return dst.values();
 }
 
-TYPED_TEST(Thresholds, EqualElementsPassAndValueIsStoredAsGiven)
+TYPED_TEST(Thresholds, EqualNaNAndSignedZeroElementsPassAndValueIsStoredAsGiven)
 {
     using T = TypeParam;
-    const std::vector<T> x = {T(-1), T(0), T(1)};
     const auto cases = ThresholdCases<T>();
-    const T nan = QuietNaN<T>(0x55);
-    // Member, value, result at level 0; the value goes in as given, on the
-    // other side of the level or NaN.
+    const T nan = QuietNaN<T>(0x55), negNan = -QuietNaN<T>(0x99);
+    // Member, value, result at level 0 on {-1, 0, 1}; the value goes in as
+    // given, on the other side of the level or NaN.
     const std::tuple<int, T, std::vector<T>> table[] = {
         {0, T(0), {T(0), T(0), T(1)}},    {1, T(0), {T(-1), T(0), T(0)}},     {2, T(5), {T(5), T(0), T(1)}},
         {4, T(-5), {T(-1), T(0), T(-5)}}, {2, T(100), {T(100), T(0), T(1)}},  {3, nan, {nan, T(0), T(1)}},
         {4, T(-100), {T(-1), T(0), T(-100)}}, {5, nan, {T(-1), T(0), nan}}};
     for (const auto& [k, value, expected] : table)
-        EXPECT_TRUE(SameBitsArray(expected, RunCase(cases[k], x, T(0), value))) << cases[k].name;
-}
-
-TYPED_TEST(Thresholds, NaNAndSignedZerosKeepTheirBits)
-{
-    using T = TypeParam;
-    const T nan = QuietNaN<T>(0x1234);
-    const T negNan = -QuietNaN<T>(0x99);
+        EXPECT_TRUE(SameBitsArray(expected, RunCase(cases[k], {T(-1), T(0), T(1)}, T(0), value))) << cases[k].name;
     const std::vector<T> x = {T(-3), nan, T(3), negNan, T(0)}, zeros = {T(0), -T(0)};
-    for (const auto& c : ThresholdCases<T>()) {
+    for (const auto& c : cases) {
         SCOPED_TRACE(c.name);
         const auto out = RunCase(c, x, T(0), T(7));
         EXPECT_TRUE(SameBits(nan, out[1]));
@@ -143,12 +132,8 @@ std::vector<T> LevelRichReals(std::size_t count, std::uint32_t seed, T level)
     auto values = RandomReals<T>(count, seed, T(-2), T(2));
     std::mt19937 engine(seed + 17u);
     for (auto& v : values) {
-        switch (engine() % 8) {
-            case 0: v = level; break;
-            case 1: v = QuietNaN<T>(engine() % 64 + 1); break;
-            case 2: v = -T(0); break;
-            default: break;
-        }
+        const auto k = engine() % 8;
+        v = k == 0 ? level : k == 1 ? QuietNaN<T>(engine() % 64 + 1) : k == 2 ? -T(0) : v;
     }
     return values;
 }
@@ -205,15 +190,15 @@ TEST(TrimFloat, LowIsTestedFirstAndNaNPasses)
 TYPED_TEST(Thresholds, VectorSlopeTakesTheStartThenTheStep)
 {
     using T = TypeParam;
-    GuardedBuffer<T> dst(9, T(-1));
+    GuardedBuffer<T> dst(5, T(-1));
     ku::VectorSlope(4u, dst.data(), T(1), T(0.5));
-    EXPECT_TRUE(SameBitsArray(std::vector<T>{T(1), T(1.5), T(2), T(2.5), T(-1)}, std::vector<T>(&dst[0], &dst[5])));
-    ku::VectorSlope(9u, dst.data(), T(0), T(0));
-    EXPECT_TRUE(SameBitsArray(std::vector<T>(9, T(0)), dst.values()));
-    EXPECT_TRUE(dst.Intact());
+    EXPECT_TRUE(SameBitsArray({T(1), T(1.5), T(2), T(2.5), T(-1)}, dst.values()));
+    ku::VectorSlope(5u, dst.data(), T(0), T(0));
+    EXPECT_TRUE(SameBitsArray(std::vector<T>(5, T(0)), dst.values()));
     // dst[3] is 3 * 0.1 rounded, plus 0: not three additions of 0.1.
     ku::VectorSlope(4u, dst.data(), T(0), T(0.1));
     EXPECT_TRUE(SameBits(T(T(3) * T(0.1)) + T(0), dst[3]));
+    EXPECT_TRUE(dst.Intact());
 }
 
 TYPED_TEST(Thresholds, VectorSlopeComputesEachElementFromItsIndex)
