@@ -17,41 +17,22 @@ using namespace kestaccel_test;
 using kestcore::utility::int24_t;
 namespace ku = kestaccel::utility;
 
-int24_t FromBytes(unsigned char b0, unsigned char b1, unsigned char b2)
+template <class Word>
+Word Swapped(Word word)
 {
-    int24_t word;
-    word.bytes[0] = b0;
-    word.bytes[1] = b1;
-    word.bytes[2] = b2;
+    ku::SwapBytes(1, &word);
     return word;
 }
 
 TEST(SwapBytesHandWorked, EachWidth)
 {
-    unsigned short h = 0x1234;
-    ku::SwapBytes(1, &h);
-    EXPECT_EQ(0x3412, h);
-
-    unsigned int w = 0x12345678u;
-    ku::SwapBytes(1, &w);
-    EXPECT_EQ(0x78563412u, w);
-
-    unsigned long long q = 0x0102030405060708ull;
-    ku::SwapBytes(1, &q);
-    EXPECT_EQ(0x0807060504030201ull, q);
-
-    int24_t p = FromBytes(0xC0, 0xFF, 0xEE);
-    ku::SwapBytes(1, &p);
-    EXPECT_EQ(0xEE, p.bytes[0]);
-    EXPECT_EQ(0xFF, p.bytes[1]);
-    EXPECT_EQ(0xC0, p.bytes[2]);
-    ku::SwapBytes(1, &p);
-    EXPECT_TRUE(p == FromBytes(0xC0, 0xFF, 0xEE));
-
-    const int24_t src = FromBytes(0x01, 0x02, 0x03);
-    int24_t dst = FromBytes(0, 0, 0);
-    ku::SwapBytes(1, &src, &dst);
-    EXPECT_TRUE(dst == FromBytes(0x03, 0x02, 0x01));
+    EXPECT_EQ(0x3412, Swapped<unsigned short>(0x1234));
+    EXPECT_EQ(0x78563412u, Swapped(0x12345678u));
+    EXPECT_EQ(0x0807060504030201ull, Swapped(0x0102030405060708ull));
+    int24_t word;
+    std::memcpy(&word, "\xC0\xFF\xEE", 3);
+    EXPECT_EQ(0, std::memcmp(Swapped(word).bytes, "\xEE\xFF\xC0", 3));
+    EXPECT_TRUE(Swapped(Swapped(word)) == word);
 }
 
 template <class Word>
@@ -59,91 +40,50 @@ class SwapBytesTest : public ::testing::Test {};
 using WordTypes = ::testing::Types<unsigned short, unsigned int, unsigned long long, int24_t>;
 TYPED_TEST_SUITE(SwapBytesTest, WordTypes);
 
-template <class Word>
-std::vector<Word> RandomWords(std::size_t count, std::uint32_t seed)
-{
-    std::mt19937 engine(seed);
-    std::vector<unsigned char> bytes(count * sizeof(Word));
-    for (auto& b : bytes) b = static_cast<unsigned char>(engine() >> 24);
-    std::vector<Word> words(count);
-    if (count) std::memcpy(static_cast<void*>(words.data()), bytes.data(), bytes.size());
-    return words;
-}
-
-// The reference works on the object's bytes, independent of shifts and masks.
-template <class Word>
-Word Reversed(Word word)
-{
-    unsigned char bytes[sizeof(Word)];
-    std::memcpy(bytes, &word, sizeof(Word));
-    std::reverse(bytes, bytes + sizeof(Word));
-    Word result;
-    std::memcpy(static_cast<void*>(&result), bytes, sizeof(Word));
-    return result;
-}
-
-template <class Word>
-bool SameWords(const std::vector<Word>& a, const std::vector<Word>& b)
-{
-    return a.size() == b.size() && (a.empty() || std::memcmp(a.data(), b.data(), a.size() * sizeof(Word)) == 0);
-}
-
+// The reference reverses each word's bytes in a byte array, independent of
+// shifts and masks. Checked: both forms, count 0 included; twice gives the
+// data back; the second-buffer form on one buffer is the in-place form; and a
+// destination one word behind the source reads back what the previous step
+// wrote, so the ascending loop alternates reversed and original words.
 TYPED_TEST(SwapBytesTest, MatchesByteReversal)
 {
     using Word = TypeParam;
-    for (unsigned int n : InterestingSizes()) {
-        const std::uint32_t seed = 400 + n;
-        SCOPED_TRACE(SeedTrace(seed));
-        const auto src = RandomWords<Word>(n, seed);
-        std::vector<Word> expected(n);
-        for (std::size_t i = 0; i < n; ++i) expected[i] = Reversed(src[i]);
+    const std::size_t w = sizeof(Word);
+    std::vector<unsigned int> sizes = InterestingSizes();
+    sizes.push_back(0);
+    for (unsigned int n : sizes) {
+        SCOPED_TRACE(::testing::Message() << SeedTrace(400 + n) << " count " << n);
+        std::mt19937 engine(400 + n);
+        std::vector<unsigned char> raw((n + 1) * w);  // one spare word for the overlapping call
+        for (auto& b : raw) b = static_cast<unsigned char>(engine() >> 24);
+        auto expected = raw, chained = raw;
+        for (std::size_t i = 0; i < n; ++i) {
+            std::reverse(&expected[i * w], &expected[(i + 1) * w]);
+            std::reverse_copy(&chained[i * w], &chained[(i + 1) * w], &chained[(i + 1) * w]);
+        }
+        std::vector<Word> src(n + 1);
+        std::memcpy(static_cast<void*>(src.data()), raw.data(), raw.size());
+        const auto same = [](const void* p, const std::vector<unsigned char>& bytes, std::size_t count) {
+            return std::memcmp(p, bytes.data(), count) == 0;
+        };
 
-        auto srcCopy = src;
-        GuardedBuffer<Word> dst(n);
-        ku::SwapBytes(n, static_cast<const Word*>(srcCopy.data()), dst.data());
-        EXPECT_TRUE(SameWords(expected, dst.values())) << "count " << n;
-        EXPECT_TRUE(SameWords(src, srcCopy)) << "source changed, count " << n;
-        EXPECT_TRUE(dst.Intact());
-
-        GuardedBuffer<Word> inPlace(n);
-        std::copy(src.begin(), src.end(), inPlace.data());
+        GuardedBuffer<Word> dst(n), inPlace(n);
+        ku::SwapBytes(n, static_cast<const Word*>(src.data()), dst.data());
+        EXPECT_TRUE(same(dst.data(), expected, n * w));
+        EXPECT_TRUE(same(src.data(), raw, raw.size())) << "source changed";
+        std::copy(src.begin(), src.begin() + n, inPlace.data());
         ku::SwapBytes(n, inPlace.data());
-        EXPECT_TRUE(SameWords(expected, inPlace.values())) << "count " << n;
-        EXPECT_TRUE(inPlace.Intact());
-
-        // Twice gives the data back.
+        EXPECT_TRUE(same(inPlace.data(), expected, n * w));
         ku::SwapBytes(n, inPlace.data());
-        EXPECT_TRUE(SameWords(src, inPlace.values())) << "count " << n;
+        EXPECT_TRUE(same(inPlace.data(), raw, n * w));
+        EXPECT_TRUE(dst.Intact() && inPlace.Intact());
 
-        // The second-buffer form on one buffer is the in-place form.
-        auto same = src;
-        ku::SwapBytes(n, static_cast<const Word*>(same.data()), same.data());
-        EXPECT_TRUE(SameWords(expected, same)) << "count " << n;
+        auto one = src, shifted = src;
+        ku::SwapBytes(n, static_cast<const Word*>(one.data()), one.data());
+        EXPECT_TRUE(same(one.data(), expected, raw.size())) << "on one buffer";
+        ku::SwapBytes(n, static_cast<const Word*>(shifted.data()), shifted.data() + 1);
+        EXPECT_TRUE(same(shifted.data(), chained, raw.size())) << "overlapping";
     }
-}
-
-// A destination one word behind the source reads back what the previous step
-// wrote: the ascending loop alternates reversed and original words.
-TYPED_TEST(SwapBytesTest, OverlapFollowsAscendingOrder)
-{
-    using Word = TypeParam;
-    for (unsigned int n : {9u, 64u, 1023u}) {
-        auto buffer = RandomWords<Word>(n + 1, 500 + n);
-        auto expected = buffer;
-        for (std::size_t i = 0; i < n; ++i) expected[i + 1] = Reversed(expected[i]);
-        ku::SwapBytes(n, static_cast<const Word*>(buffer.data()), buffer.data() + 1);
-        EXPECT_TRUE(SameWords(expected, buffer)) << "count " << n;
-    }
-}
-
-TYPED_TEST(SwapBytesTest, EmptyCallTouchesNothing)
-{
-    using Word = TypeParam;
-    ku::SwapBytes(0, static_cast<Word*>(nullptr));
-    ku::SwapBytes(0, static_cast<const Word*>(nullptr), static_cast<Word*>(nullptr));
-    GuardedBuffer<Word> untouched(0);
-    ku::SwapBytes(0, untouched.data());
-    EXPECT_TRUE(untouched.Intact());
 }
 
 // Packed 24-bit words start at any byte: an array placed at an odd address
@@ -152,15 +92,10 @@ TEST(SwapBytes24, UnalignedArray)
 {
     std::vector<unsigned char> storage(1 + 3 * 5 + 1, 0x5A);
     for (std::size_t i = 0; i < 15; ++i) storage[1 + i] = static_cast<unsigned char>(0x10 + i);
-    auto* words = reinterpret_cast<int24_t*>(storage.data() + 1);
-    ku::SwapBytes(5, words);
-    for (std::size_t k = 0; k < 5; ++k) {
-        EXPECT_EQ(0x10 + 3 * k + 2, storage[1 + 3 * k]);
-        EXPECT_EQ(0x10 + 3 * k + 1, storage[2 + 3 * k]);
-        EXPECT_EQ(0x10 + 3 * k, storage[3 + 3 * k]);
-    }
-    EXPECT_EQ(0x5A, storage.front());
-    EXPECT_EQ(0x5A, storage.back());
+    ku::SwapBytes(5, reinterpret_cast<int24_t*>(storage.data() + 1));
+    const std::vector<unsigned char> expected = {0x5A, 0x12, 0x11, 0x10, 0x15, 0x14, 0x13, 0x18, 0x17,
+                                                 0x16, 0x1B, 0x1A, 0x19, 0x1E, 0x1D, 0x1C, 0x5A};
+    EXPECT_EQ(expected, storage);
 }
 
 }  // namespace
