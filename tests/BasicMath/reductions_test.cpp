@@ -6,6 +6,7 @@
 #include <kestaccel/BasicMath.h>
 #include <kestaccel/DSP.h>
 
+#include <algorithm>
 #include <cmath>
 #include <utility>
 
@@ -210,30 +211,6 @@ TYPED_TEST(Reductions, MaxAndMinKeepTheFirstOfEqualsAndSkipLaterNaN)
                                              ku::Min(3u, first), ku::Max(0u, later), ku::Min(0u, later)}));
 }
 
-TYPED_TEST(Reductions, ScansMatchTheFirstOfEqualsLoop)
-{
-    using T = TypeParam;
-    std::uint32_t seed = 600;
-    for (unsigned int n : InterestingSizes()) {
-        SCOPED_TRACE("size " + std::to_string(n) + " " + SeedTrace(seed));
-        const auto x = TieRichReals<T>(n, seed++);
-        std::size_t hi = 0, lo = 0;
-        for (std::size_t i = 1; i < n; ++i) {
-            if (x[i] > x[hi]) hi = i;
-            if (x[lo] > x[i]) lo = i;
-        }
-        EXPECT_TRUE(SameBits(x[hi], ku::Max(n, x.data())));
-        EXPECT_TRUE(SameBits(x[lo], ku::Min(n, x.data())));
-        if constexpr (std::is_same<T, float>::value) {
-            float value = 0;
-            EXPECT_EQ(hi, ku::MaxIndex(n, x.data(), &value));
-            EXPECT_TRUE(SameBits(x[hi], value));
-            EXPECT_EQ(lo, ku::MinIndex(n, x.data(), &value));
-            EXPECT_TRUE(SameBits(x[lo], value));
-        }
-    }
-}
-
 TEST(ScansFloat, IndexScansReportTheFirstOfEquals)
 {
     // The hand-worked pair first; -0 and +0 then tell first from last.
@@ -333,15 +310,30 @@ TEST(ScansFloat, PeakMagnitude)
     EXPECT_TRUE(SameBits(-5.0f, ku::MinMax(y, 2u)));
 }
 
-TEST(ScansFloat, PairedScansMatchTheLoop)
+TYPED_TEST(Reductions, ScansMatchTheLoopsWrittenOut)
 {
-    std::uint32_t seed = 800;
+    using T = TypeParam;
+    std::uint32_t seed = 600;
     for (unsigned int n : InterestingSizes()) {
         SCOPED_TRACE("size " + std::to_string(n) + " " + SeedTrace(seed));
-        for (const auto& x : {TieRichReals<float>(n, seed), RandomReals<float>(n, seed + 1, -4.0f, 3.0f)}) {
-            const Pair s = LoopPairedScan(x, n, 1, {0, 0});
-            EXPECT_TRUE(PairedScanGives(x, n, s.lo, s.hi));
-            EXPECT_TRUE(SameBits(LoopPeak(x, n), ku::MinMax(x.data(), n)));
+        for (const auto& x : {TieRichReals<T>(n, seed), RandomReals<T>(n, seed + 1, T(-4), T(3))}) {
+            std::size_t hi = 0, lo = 0;  // the first of equals
+            for (std::size_t i = 1; i < n; ++i) {
+                if (x[i] > x[hi]) hi = i;
+                if (x[lo] > x[i]) lo = i;
+            }
+            EXPECT_TRUE(SameBits(x[hi], ku::Max(n, x.data())));
+            EXPECT_TRUE(SameBits(x[lo], ku::Min(n, x.data())));
+            if constexpr (std::is_same<T, float>::value) {
+                float value = 0;
+                EXPECT_EQ(hi, ku::MaxIndex(n, x.data(), &value));
+                EXPECT_TRUE(SameBits(x[hi], value));
+                EXPECT_EQ(lo, ku::MinIndex(n, x.data(), &value));
+                EXPECT_TRUE(SameBits(x[lo], value));
+                const Pair s = LoopPairedScan(x, n, 1, {0, 0});
+                EXPECT_TRUE(PairedScanGives(x, n, s.lo, s.hi));
+                EXPECT_TRUE(SameBits(LoopPeak(x, n), ku::MinMax(x.data(), n)));
+            }
         }
         seed += 2;
     }
@@ -395,10 +387,8 @@ TEST(EveryFloat, MatchTheScalarLoopOnRandomData)
         const auto a = TieRichReals<float>(n, seed++);
         const auto b = TieRichReals<float>(n, seed++);
         std::vector<float> maxRef(n), minRef(n);
-        for (std::size_t i = 0; i < n; ++i) {
-            maxRef[i] = MaxOf(a[i], b[i]);
-            minRef[i] = MinOf(a[i], b[i]);
-        }
+        std::transform(a.begin(), a.end(), b.begin(), maxRef.begin(), MaxOf);
+        std::transform(a.begin(), a.end(), b.begin(), minRef.begin(), MinOf);
         ExpectEvery(ku::MaxEvery, ku::MaxEvery_InPlace, a, b, maxRef);
         ExpectEvery(ku::MinEvery, ku::MinEvery_InPlace, a, b, minRef);
     }
