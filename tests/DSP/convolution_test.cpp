@@ -57,8 +57,7 @@ TYPED_TEST(ConvolveTyped, MatchesOneOutputAtATimeBitForBit)
     std::size_t swapDiffers = 0;
     for (const auto& shape : shapes) {
         const std::uint32_t seed = 2000 + 1000 * shape.first + shape.second;
-        SCOPED_TRACE(SeedTrace(seed));
-        SCOPED_TRACE(std::to_string(shape.first) + " by " + std::to_string(shape.second));
+        SCOPED_TRACE(SeedTrace(seed) + ", " + std::to_string(shape.first) + " by " + std::to_string(shape.second));
         auto a = RandomReals<T>(shape.first, seed);
         const auto b = RandomReals<T>(shape.second, seed + 1);
         for (std::size_t i = 0; i < a.size(); i += 2) a[i] *= T(4096);
@@ -81,8 +80,8 @@ TYPED_TEST(ConvolveTyped, MatchesOneOutputAtATimeBitForBit)
 
 // The worked example; 1, 1e8, -1e8 against three ones, whose middle output
 // (1 + 1e8) - 1e8 is 0 in float, which sums in float in ascending order,
-// and 1 in double; sums start from +0, so sums of -2 * 0 give +0; one empty array
-// against one element writes nothing; no work area is ever needed.
+// and 1 in double; sums start from +0, so sums of -2 * 0 give +0; one
+// empty array against one element writes nothing; no work area is needed.
 TYPED_TEST(ConvolveTyped, WorkedValuesAndEdges)
 {
     using T = TypeParam;
