@@ -15,12 +15,11 @@ using Taps = cpp::PoolVector<float>;
 // Taps numbered 0, 1, ... so that a branch shows which taps it holds.
 struct Record {
     kestaccel::MRFState_Float* state = nullptr;
-    Record(unsigned int up, unsigned int down, unsigned int tapCount, unsigned int reference = 0,
-           unsigned int start = 0)
+    Record(unsigned int up, unsigned int down, unsigned int tapCount)
     {
         std::vector<float> taps(tapCount);
         for (unsigned int k = 0; k < tapCount; ++k) taps[k] = float(k);
-        cpp::MRFInit(&state, up, down, taps.data(), tapCount, Taps(), reference, start);
+        cpp::MRFInit(&state, up, down, taps.data(), tapCount, Taps(), 0, 0);
     }
     ~Record() { cpp::MRFFree(state); }
 };
