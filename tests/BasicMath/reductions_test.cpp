@@ -287,6 +287,8 @@ TEST(ScansFloat, PairedScanTakesTheFirstSmallestAndTheLastLargest)
     // maximum, and the next element so tested replaces it.
     EXPECT_TRUE(PairedScanGives({0, 1, nan}, 3, 0, 2));
     EXPECT_TRUE(PairedScanGives({0, 1, nan, 2, 1}, 5, 0, 3));
+    // A last single element that becomes the minimum is not tested as a maximum.
+    EXPECT_TRUE(PairedScanGives({0, 1, nan, -5}, 4, 3, 2));
     // NaN as the first of a pair is passed over; NaN in element 0 stays the minimum.
     EXPECT_TRUE(PairedScanGives({0, nan, 1}, 3, 0, 2));
     EXPECT_TRUE(PairedScanGives({nan, -5, 5}, 3, 0, 2));
