@@ -26,21 +26,19 @@ namespace ku = kestaccel::utility;
 using Ints = std::vector<long long>;
 
 // ---------------------------------------------------------------------------
-// The reference: plain scalar steps, one element at a time. NaN and results
-// outside int give the indefinite value explicitly, whatever the width of long.
+// The reference: plain scalar steps, one element at a time.
 // ---------------------------------------------------------------------------
 
-int RefInt(float x, bool round)
+// Truncation, or lroundf for float and lround for double; NaN and results
+// outside int give the indefinite value explicitly, whatever the width of long.
+template <class Real>
+int RefInt(Real x, bool round)
 {
-    if (std::isnan(x) || x < -2147483648.0f || x >= 2147483648.0f) return INT_MIN;
-    return round ? static_cast<int>(std::lroundf(x)) : static_cast<int>(x);
-}
-
-int RefInt(double x, bool round)
-{
-    if (std::isnan(x) || x <= (round ? -2147483648.5 : -2147483649.0) || x >= (round ? 2147483647.5 : 2147483648.0))
+    const double v = x;
+    if (std::isnan(v) || v <= (round ? -2147483648.5 : -2147483649.0) || v >= (round ? 2147483647.5 : 2147483648.0))
         return INT_MIN;
-    return round ? static_cast<int>(std::lround(x)) : static_cast<int>(x);
+    if (!round) return static_cast<int>(x);
+    return static_cast<int>(std::is_same_v<Real, float> ? std::lroundf(static_cast<float>(x)) : std::lround(v));
 }
 
 // 8 and 16 bits keep the low bits, 32 all of them, 24 saturate.
@@ -54,14 +52,16 @@ Dst RefStore(int value)
 }
 
 template <class Dst>
-Dst RefFromFloat(float x, int scale, bool round)
+Dst RefFromReal(float x, int scale, bool round)
 {
     const float m = std::pow(2.0f, 0.0f - static_cast<float>(scale));
     return RefStore<Dst>(RefInt(scale == 0 ? x : (x >= 1.0f ? m : (x <= -1.0f ? -m : x * m)), round));
 }
 
-// Limited elements take the float +-m, the others (double)m * x.
-int RefFromDouble(double x, int scale, bool round)
+// The double source: limited elements take the float +-m, the others
+// (double)m * x.
+template <class Dst>
+Dst RefFromReal(double x, int scale, bool round)
 {
     const float m = std::pow(2.0f, 0.0f - static_cast<float>(scale));
     if (scale == 0) return RefInt(x, round);
@@ -299,23 +299,11 @@ void CheckFromReal(std::uint32_t seedBase)
                 const std::uint32_t seed = seedBase + 7 * n + static_cast<std::uint32_t>(scale + 64);
                 SCOPED_TRACE(::testing::Message() << SeedTrace(seed) << " scale " << scale << " round " << round
                                                   << " count " << n);
-                const auto ref = [&](Real x) -> Dst {
-                    if constexpr (std::is_same_v<Real, double>) return RefFromDouble(x, scale, round);
-                    else return RefFromFloat<Dst>(x, scale, round);
-                };
+                const auto ref = [&](Real x) { return RefFromReal<Dst>(x, scale, round); };
                 ASSERT_TRUE(MatchesLoop<Dst>(MixedSources<Real>(n, seed, scale), ref, scale, round));
             }
         }
     }
-}
-
-TEST(ConvertDifferential, RealToInteger)
-{
-    CheckFromReal<float, unsigned char>(1000);
-    CheckFromReal<float, short>(1100);
-    CheckFromReal<float, int>(1200);
-    CheckFromReal<float, int24_t>(1300);
-    CheckFromReal<double, int>(2000);
 }
 
 // Float bit patterns with an odd stride: every exponent, both signs, NaNs
@@ -342,19 +330,20 @@ void CheckToReal(std::uint32_t seedBase)
     }
 }
 
-TEST(ConvertDifferential, IntegerToReal)
+// The scaled overloads, those without a scale, and the floor division by
+// 2^(scale & 31) with saturation of int to packed.
+TEST(ConvertDifferential, EveryOverloadMatchesPlainLoop)
 {
+    CheckFromReal<float, unsigned char>(1000);
+    CheckFromReal<float, short>(1100);
+    CheckFromReal<float, int>(1200);
+    CheckFromReal<float, int24_t>(1300);
+    CheckFromReal<double, int>(2000);
     CheckToReal<short, float>(3000);
     CheckToReal<short, double>(3100);
     CheckToReal<int, float>(3200);
     CheckToReal<int, double>(3300);
     CheckToReal<int24_t, float>(3400);
-}
-
-// The overloads without a scale, and the floor division by 2^(scale & 31)
-// with saturation of int to packed.
-TEST(ConvertDifferential, UnscaledAndShifted)
-{
     for (unsigned int n : kCounts) {
         SCOPED_TRACE(SeedTrace(3500 + n));
         ASSERT_TRUE(MatchesLoop<float>(RandomIntegers<unsigned char>(n, 3500 + n), [](unsigned char b) { return float(int(b)); }));
@@ -431,10 +420,10 @@ TEST(ConvertSameBuffer, FollowsAscendingOrder)
     const auto ints = RandomIntegers<int>(1031, 4201);
     std::vector<unsigned char> bytes(1031 * 4);
     std::memcpy(bytes.data(), floats.data(), bytes.size());
-    EXPECT_TRUE((InPlaceMatchesLoop<float, int>(bytes, [](float x) { return RefFromFloat<int>(x, -15, true); }, -15, true)));
+    EXPECT_TRUE((InPlaceMatchesLoop<float, int>(bytes, [](float x) { return RefFromReal<int>(x, -15, true); }, -15, true)));
     EXPECT_TRUE((InPlaceMatchesLoop<int, float>(bytes, [](int v) { return RefToReal<float>(v, 15); }, 15)));
     std::memcpy(bytes.data(), floats.data(), bytes.size());
-    const auto pack = [](float x) { return RefFromFloat<int24_t>(x, -23, true); };
+    const auto pack = [](float x) { return RefFromReal<int24_t>(x, -23, true); };
     EXPECT_TRUE((InPlaceMatchesLoop<float, int24_t>(bytes, pack, -23, true)));
     std::memcpy(bytes.data(), ints.data(), bytes.size());
     const auto shift = [](int v) { return RefStore<int24_t>(static_cast<int>(std::floor(v / 256.0))); };
