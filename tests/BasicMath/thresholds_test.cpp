@@ -107,8 +107,9 @@ TYPED_TEST(Thresholds, EqualNaNAndSignedZeroElementsPassAndValueIsStoredAsGiven)
     // Member, value, result at level 0 on {-1, 0, 1}; the value goes in as
     // given, on the other side of the level or NaN.
     const std::tuple<int, T, std::vector<T>> table[] = {
-        {0, T(0), {T(0), T(0), T(1)}},    {1, T(0), {T(-1), T(0), T(0)}},     {2, T(5), {T(5), T(0), T(1)}},
-        {4, T(-5), {T(-1), T(0), T(-5)}}, {2, T(100), {T(100), T(0), T(1)}},  {3, nan, {nan, T(0), T(1)}},
+        {0, T(0), {T(0), T(0), T(1)}},        {1, T(0), {T(-1), T(0), T(0)}},
+        {2, T(5), {T(5), T(0), T(1)}},        {4, T(-5), {T(-1), T(0), T(-5)}},
+        {2, T(100), {T(100), T(0), T(1)}},    {3, nan, {nan, T(0), T(1)}},
         {4, T(-100), {T(-1), T(0), T(-100)}}, {5, nan, {T(-1), T(0), nan}}};
     for (const auto& [k, value, expected] : table)
         EXPECT_TRUE(SameBitsArray(expected, RunCase(cases[k], {T(-1), T(0), T(1)}, T(0), value))) << cases[k].name;
