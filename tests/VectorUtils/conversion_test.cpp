@@ -390,28 +390,32 @@ TEST(ConvertRoundTrip, ShortAndPackedThroughFloatAreExact)
     }
 }
 
-// Source and destination on one buffer: each element is read before it is
-// written, as in the ascending scalar loop, which runs here on `bytes` (left
-// holding its result). Packing to 24 bits there (as audio code does to save a
-// copy) puts each 3-byte write behind the 4-byte reads still to come; a
-// blocked fast path would read bytes already overwritten.
+// Source and destination on one buffer, the destination `offset` bytes in:
+// the result is the ascending element loop's, run here on `bytes` (left
+// holding its result). Packing to 24 bits on the source itself (as audio code
+// does to save a copy) puts each 3-byte write behind the 4-byte reads still
+// to come; with the destination ahead, the first elements read bytes written
+// by earlier ones, which a blocked fast path would read too early.
+// Unpacking writes ahead of the reads still to come.
 template <class Src, class Dst, class Ref, class... Args>
-::testing::AssertionResult InPlaceMatchesLoop(std::vector<unsigned char>& bytes, Ref ref, Args... args)
+::testing::AssertionResult InPlaceMatchesLoop(std::vector<unsigned char>& bytes, std::size_t offset, Ref ref,
+                                              Args... args)
 {
-    void* raw = std::malloc(bytes.size());
+    auto* raw = static_cast<unsigned char*>(std::malloc(bytes.size()));
     std::memcpy(raw, bytes.data(), bytes.size());
-    const std::size_t n = bytes.size() / sizeof(Src);
-    ku::Convert(static_cast<unsigned int>(n), static_cast<const Src*>(raw), static_cast<Dst*>(raw), args...);
+    const std::size_t n = (bytes.size() - offset) / std::max(sizeof(Src), sizeof(Dst));
+    ku::Convert(static_cast<unsigned int>(n), reinterpret_cast<const Src*>(raw), reinterpret_cast<Dst*>(raw + offset),
+                args...);
     for (std::size_t i = 0; i < n; ++i) {
         Src x;
         std::memcpy(&x, &bytes[i * sizeof(Src)], sizeof x);
         const Dst y = ref(x);
-        std::memcpy(&bytes[i * sizeof(Dst)], &y, sizeof y);
+        std::memcpy(&bytes[offset + i * sizeof(Dst)], &y, sizeof y);
     }
     const bool same = std::memcmp(raw, bytes.data(), bytes.size()) == 0;
     std::free(raw);
     if (same) return ::testing::AssertionSuccess();
-    return ::testing::AssertionFailure() << "differs from the ascending element loop";
+    return ::testing::AssertionFailure() << "differs from the ascending element loop, offset " << offset;
 }
 
 TEST(ConvertSameBuffer, FollowsAscendingOrder)
@@ -420,14 +424,18 @@ TEST(ConvertSameBuffer, FollowsAscendingOrder)
     const auto ints = RandomIntegers<int>(1031, 4201);
     std::vector<unsigned char> bytes(1031 * 4);
     std::memcpy(bytes.data(), floats.data(), bytes.size());
-    EXPECT_TRUE((InPlaceMatchesLoop<float, int>(bytes, [](float x) { return RefFromReal<int>(x, -15, true); }, -15, true)));
-    EXPECT_TRUE((InPlaceMatchesLoop<int, float>(bytes, [](int v) { return RefToReal<float>(v, 15); }, 15)));
-    std::memcpy(bytes.data(), floats.data(), bytes.size());
+    EXPECT_TRUE((InPlaceMatchesLoop<float, int>(bytes, 0, [](float x) { return RefFromReal<int>(x, -15, true); }, -15, true)));
+    EXPECT_TRUE((InPlaceMatchesLoop<int, float>(bytes, 0, [](int v) { return RefToReal<float>(v, 15); }, 15)));
     const auto pack = [](float x) { return RefFromReal<int24_t>(x, -23, true); };
-    EXPECT_TRUE((InPlaceMatchesLoop<float, int24_t>(bytes, pack, -23, true)));
-    std::memcpy(bytes.data(), ints.data(), bytes.size());
     const auto shift = [](int v) { return RefStore<int24_t>(static_cast<int>(std::floor(v / 256.0))); };
-    EXPECT_TRUE((InPlaceMatchesLoop<int, int24_t>(bytes, shift, 8)));
+    for (std::size_t offset : {0, 4}) {
+        std::memcpy(bytes.data(), floats.data(), bytes.size());
+        EXPECT_TRUE((InPlaceMatchesLoop<float, int24_t>(bytes, offset, pack, -23, true)));
+        std::memcpy(bytes.data(), ints.data(), bytes.size());
+        EXPECT_TRUE((InPlaceMatchesLoop<int, int24_t>(bytes, offset, shift, 8)));
+        EXPECT_TRUE((InPlaceMatchesLoop<int24_t, float>(bytes, offset, [](int v) { return RefToReal<float>(v, 23); }, 23)));
+        EXPECT_TRUE((InPlaceMatchesLoop<int24_t, int>(bytes, offset, [](int v) { return v; })));
+    }
 }
 
 }  // namespace
