@@ -100,7 +100,7 @@ TYPED_TEST(LayoutTest, MatchPlainLoops)
 
 // A destination on a source, so that elements read values written earlier:
 // the interleaved buffer starting on the first channel, and the first channel
-// written over the interleaved source. Only the frame-outer, ascending order
+// written over the interleaved source, in both forms. Only the frame-outer, ascending order
 // gives the plain loop's result.
 TYPED_TEST(LayoutTest, OverlapFollowsAscendingOrder)
 {
@@ -108,9 +108,10 @@ TYPED_TEST(LayoutTest, OverlapFollowsAscendingOrder)
     for (unsigned int n : {5u, 19u, 64u, 1023u}) {
         SCOPED_TRACE(::testing::Message() << "count " << n);
         auto three = Samples<T>(3 * n, 300 + n), pair = Samples<T>(2 * n, 310 + n), split = Samples<T>(2 * n, 320 + n);
+        auto splitThree = Samples<T>(3 * n, 350 + n);
         const auto second = Samples<T>(n, 330 + n), third = Samples<T>(n, 340 + n);
-        auto expectedThree = three, expectedPair = pair, expectedSplit = split;
-        std::vector<T> right(n), expectedRight(n);
+        auto expectedThree = three, expectedPair = pair, expectedSplit = split, expectedSplitThree = splitThree;
+        std::vector<T> right(n), expectedRight(n), mid(n), last(n), expectedMid(n), expectedLast(n);
         for (std::size_t i = 0; i < n; ++i) {
             const T* planes[] = {expectedThree.data(), second.data(), third.data()};
             for (std::size_t c = 0; c < 3; ++c) expectedThree[3 * i + c] = planes[c][i];
@@ -120,15 +121,23 @@ TYPED_TEST(LayoutTest, OverlapFollowsAscendingOrder)
             const T even = expectedSplit[2 * i], odd = expectedSplit[2 * i + 1];
             expectedSplit[i] = even;
             expectedRight[i] = odd;
+            const T x0 = expectedSplitThree[3 * i], x1 = expectedSplitThree[3 * i + 1], x2 = expectedSplitThree[3 * i + 2];
+            expectedSplitThree[i] = x0;
+            expectedMid[i] = x1;
+            expectedLast[i] = x2;
         }
         const T* const sources[] = {three.data(), second.data(), third.data()};
+        T* const destinations[] = {splitThree.data(), mid.data(), last.data()};
         ku::Interleave(3, n, sources, three.data());
+        ku::Deinterleave(3, n, splitThree.data(), destinations);
         ku::Interleave(n, pair.data(), second.data(), pair.data());
         ku::Deinterleave(n, split.data(), split.data(), right.data());
         EXPECT_TRUE(SameBitsArray(expectedThree, three));
         EXPECT_TRUE(SameBitsArray(expectedPair, pair));
         EXPECT_TRUE(SameBitsArray(expectedSplit, split));
         EXPECT_TRUE(SameBitsArray(expectedRight, right));
+        EXPECT_TRUE(SameBitsArray(expectedSplitThree, splitThree));
+        EXPECT_TRUE(SameBitsArray(expectedMid, mid) && SameBitsArray(expectedLast, last));
     }
 }
 
