@@ -262,11 +262,8 @@ TEST(ConvertHandWorked, PackedAndWidth)
         EXPECT_EQ(s.expected, static_cast<int>(Converted<int, int24_t>({s.v}, s.scale)[0])) << s.v << " >> " << s.scale;
     EXPECT_TRUE((Converted<int, int24_t>({}, 8).empty()));  // count 0: the guard sees no write
 
-    // Sign extension of bit 23, no shift.
-    int24_t words[3];
-    const unsigned char bytes[] = {0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 0x7F, 0x00, 0x00, 0x80};
-    std::memcpy(words, bytes, sizeof bytes);
-    EXPECT_EQ((std::vector<int>{-1, 8388607, -8388608}), (Converted<int24_t, int>({words[0], words[1], words[2]})));
+    // Sign extension of bit 23 (bytes FF FF FF, FF FF 7F, 00 00 80), no shift.
+    EXPECT_EQ((std::vector<int>{-1, 8388607, -8388608}), (Converted<int24_t, int>({-1, 8388607, -8388608})));
 
     const double inf = std::numeric_limits<double>::infinity();
     EXPECT_TRUE(SameBitsArray(std::vector<float>{float(inf), float(-inf), -0.0f, static_cast<float>(0.1)},

@@ -34,8 +34,9 @@ TEST(Int24, LayoutAndUnalignedAccess)
     for (int i = 0; i < 7; ++i) EXPECT_EQ(values[i], static_cast<int>(words[i])) << "element " << i;
 }
 
-TEST(Int24, SaturatesAndSignExtendsBit23)
+TEST(Int24, ConversionsAndEquality)
 {
+    // From int saturates; to int sign-extends bit 23 of any three bytes.
     const struct { int in, out; } cases[] = {{8388607, 8388607},   {8388608, 8388607}, {INT_MAX, 8388607},
                                              {-8388608, -8388608}, {-8388609, -8388608}, {INT_MIN, -8388608},
                                              {0, 0}, {-5, -5}, {0x01000000, 8388607}};
@@ -48,20 +49,16 @@ TEST(Int24, SaturatesAndSignExtendsBit23)
         const long long value = word.bytes[0] + 256LL * word.bytes[1] + 65536LL * word.bytes[2];
         ASSERT_EQ(word.bytes[2] >= 0x80 ? value - 16777216LL : value, static_cast<int>(word));
     }
-}
 
-TEST(Int24, EqualityComparesTheThreeBytes)
-{
+    // Equality compares the three bytes; saturated values equal their limit.
     const int24_t a(1000);
-    EXPECT_TRUE(a == int24_t(1000));
-    EXPECT_FALSE(a != int24_t(1000));
+    EXPECT_TRUE(a == int24_t(1000) && !(a != int24_t(1000)));
     for (int i = 0; i < 3; ++i) {
         int24_t c = a;
         c.bytes[i] ^= 0x01;
-        EXPECT_FALSE(a == c) << "byte " << i;
-        EXPECT_TRUE(a != c) << "byte " << i;
+        EXPECT_TRUE(!(a == c) && a != c) << "byte " << i;
     }
-    EXPECT_TRUE(int24_t(9000000) == int24_t(8388607));  // saturated values equal their limit
+    EXPECT_TRUE(int24_t(9000000) == int24_t(8388607));
 }
 
 }  // namespace
