@@ -239,13 +239,11 @@ TEST(ConvertHandWorked, IntegerToRealTable)
         SCOPED_TRACE(::testing::Message() << r.v << " scale " << r.scale);
         EXPECT_TRUE(SameBits(r.f, Converted<int, float>({r.v}, r.scale)[0]));
         EXPECT_TRUE(SameBits(r.d, Converted<int, double>({r.v}, r.scale)[0]));
-        if (r.v >= -32768 && r.v <= 32767) {
-            EXPECT_TRUE(SameBits(r.f, Converted<short, float>({static_cast<short>(r.v)}, r.scale)[0]));
-            EXPECT_TRUE(SameBits(r.d, Converted<short, double>({static_cast<short>(r.v)}, r.scale)[0]));
-        }
-        if (r.v >= -8388608 && r.v <= 8388607) {
-            EXPECT_TRUE(SameBits(r.f, Converted<int24_t, float>({int24_t(r.v)}, r.scale)[0]));
-        }
+        if (r.v < -8388608 || r.v > 8388607) continue;
+        EXPECT_TRUE(SameBits(r.f, Converted<int24_t, float>({int24_t(r.v)}, r.scale)[0]));
+        if (r.v < -32768 || r.v > 32767) continue;
+        EXPECT_TRUE(SameBits(r.f, Converted<short, float>({static_cast<short>(r.v)}, r.scale)[0]));
+        EXPECT_TRUE(SameBits(r.d, Converted<short, double>({static_cast<short>(r.v)}, r.scale)[0]));
     }
     // Bytes are unsigned and pass by value.
     EXPECT_TRUE(SameBitsArray(std::vector<float>{0.0f, 128.0f, 255.0f}, Converted<unsigned char, float>({0, 128, 255})));
