@@ -204,7 +204,7 @@ TEST(ConvertHandWorked, FloatToIntegerTable)
     }
 }
 
-// Overload 12 keeps the float m for limited elements and multiplies the
+// Double to int keeps the float m for limited elements and multiplies the
 // others in double: 0.1 * 2^31 is 214748364.8 in double, while the float
 // 0.1f * 2^31 would give 214748368. At scale 1, lroundf(+-0.5f) is +-1.
 TEST(ConvertHandWorked, DoubleToIntMixesFloatLimitAndDoubleProduct)
