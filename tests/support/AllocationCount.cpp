@@ -31,12 +31,25 @@ void CountedRelease(void* p)
 
 }  // namespace
 
+// Every form that pairs with the plain delete is replaced, the nothrow ones
+// included, so that no block from the runtime's allocator reaches free().
 void* operator new(std::size_t size) { return CountedAllocate(size); }
 void* operator new[](std::size_t size) { return CountedAllocate(size); }
+void* operator new(std::size_t size, const std::nothrow_t&) noexcept
+{
+    try {
+        return CountedAllocate(size);
+    } catch (const std::bad_alloc&) {
+        return nullptr;
+    }
+}
+void* operator new[](std::size_t size, const std::nothrow_t& tag) noexcept { return operator new(size, tag); }
 void operator delete(void* p) noexcept { CountedRelease(p); }
 void operator delete[](void* p) noexcept { CountedRelease(p); }
 void operator delete(void* p, std::size_t) noexcept { CountedRelease(p); }
 void operator delete[](void* p, std::size_t) noexcept { CountedRelease(p); }
+void operator delete(void* p, const std::nothrow_t&) noexcept { CountedRelease(p); }
+void operator delete[](void* p, const std::nothrow_t&) noexcept { CountedRelease(p); }
 
 namespace kestaccel_test {
 
