@@ -29,6 +29,23 @@ using Ints = std::vector<long long>;
 // The reference: plain scalar steps, one element at a time.
 // ---------------------------------------------------------------------------
 
+// Round half away from zero, as lroundf and lround do. MinGW's runtime adds
+// one half and rounds the largest value below one half (0.49999997f) up to
+// 1; there the reference rounds through the exact fraction instead, so that
+// both platforms check the library against the correct result.
+template <class Real>
+long RoundHalfAway(Real x)
+{
+#if defined(__MINGW32__)
+    const Real whole = std::trunc(x);
+    const Real fraction = x - whole;
+    return static_cast<long>(whole) + (fraction >= Real(0.5) ? 1 : 0) - (fraction <= Real(-0.5) ? 1 : 0);
+#else
+    if constexpr (std::is_same_v<Real, float>) return std::lroundf(x);
+    else return std::lround(x);
+#endif
+}
+
 // Truncation, or lroundf for float and lround for double; NaN and results
 // outside int give the indefinite value explicitly, whatever the width of long.
 template <class Real>
@@ -38,7 +55,7 @@ int RefInt(Real x, bool round)
     if (std::isnan(v) || v <= (round ? -2147483648.5 : -2147483649.0) || v >= (round ? 2147483647.5 : 2147483648.0))
         return INT_MIN;
     if (!round) return static_cast<int>(x);
-    return static_cast<int>(std::is_same_v<Real, float> ? std::lroundf(static_cast<float>(x)) : std::lround(v));
+    return static_cast<int>(RoundHalfAway(x));
 }
 
 // 8 and 16 bits keep the low bits, 32 all of them, 24 saturate.
