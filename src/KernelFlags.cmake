@@ -1,15 +1,18 @@
 # Per-file compile flags for kernels that need other optimisation settings
-# than the library's default (-O3). Each entry says why.
+# than the library's default (-O3). Each entry says why. The flags are GCC's
+# and Clang's; MSVC builds keep the defaults.
+function(kestaccel_kernel_flags file)
+    if(NOT MSVC)
+        set_source_files_properties(${CMAKE_CURRENT_SOURCE_DIR}/${file} PROPERTIES COMPILE_OPTIONS "${ARGN}")
+    endif()
+endfunction()
 
 # FIR: the kernel forms eight outputs at once, and -O2 turns those eight lanes
 # into two vector multiplies and two vector adds per tap. At -O3 the loop
 # vectoriser also works on the tap loop around them and fills it with
 # shuffles: 2-3x slower, same bits. The later -O2 overrides the target's -O3
 # for this file only.
-if(NOT MSVC)
-    set_source_files_properties(${CMAKE_CURRENT_SOURCE_DIR}/filter/FIR/FIR.cpp
-        PROPERTIES COMPILE_OPTIONS "-O2")
-endif()
+kestaccel_kernel_flags(filter/FIR/FIR.cpp -O2)
 
 # Sample conversion: the limit, rounding and range tests are selects, and
 # under the default trapping-math rules g++ keeps them as branches (a
@@ -17,19 +20,13 @@ endif()
 # have raised), so the loops stay scalar. No flag is read and no trap is
 # enabled here, so -fno-trapping-math changes no bit; the conversion tests
 # compare every path with a plain loop around the runtime's lroundf.
-if(NOT MSVC)
-    set_source_files_properties(${CMAKE_CURRENT_SOURCE_DIR}/utility/VectorUtils/Conversion.cpp
-        PROPERTIES COMPILE_OPTIONS "-fno-trapping-math")
-endif()
+kestaccel_kernel_flags(utility/VectorUtils/Conversion.cpp -fno-trapping-math)
 
 # Multi-rate filter: the same shape as the FIR kernel (eight cycles side by
 # side, one sum each), and the same story: -O2 makes each tap two vector
 # multiplies and adds, -O3 vectorises the tap loop with transposes instead
 # and leaves the lanes scalar. Same bits either way.
-if(NOT MSVC)
-    set_source_files_properties(${CMAKE_CURRENT_SOURCE_DIR}/filter/MultiRate/MultiRate.cpp
-        PROPERTIES COMPILE_OPTIONS "-O2")
-endif()
+kestaccel_kernel_flags(filter/MultiRate/MultiRate.cpp -O2)
 
 # Complex arithmetic: the quotient computes both forms of Smith's method and
 # selects one, so that the divide loops can run several elements at once.
@@ -38,7 +35,4 @@ endif()
 # have) and the loops stay scalar. No flag is read and no trap is enabled
 # here, so -fno-trapping-math changes no bit; the complex tests compare the
 # divide members with the plain steps of the method, element by element.
-if(NOT MSVC)
-    set_source_files_properties(${CMAKE_CURRENT_SOURCE_DIR}/utility/BasicMath/ComplexArithmetic.cpp
-        PROPERTIES COMPILE_OPTIONS "-fno-trapping-math")
-endif()
+kestaccel_kernel_flags(utility/BasicMath/ComplexArithmetic.cpp -fno-trapping-math)

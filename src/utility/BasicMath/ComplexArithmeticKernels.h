@@ -28,6 +28,16 @@ const T* Components(const std::complex<T>* z) { return reinterpret_cast<const T*
 template <class T>
 T* Components(std::complex<T>* z) { return reinterpret_cast<T*>(z); }
 
+// The product (xr, xi) * (yr, yi) on the components: four products, each
+// rounded, then one difference and one sum. Every product member uses it, so
+// MulConstant equals Mul by a vector of equal elements, bit for bit.
+template <class T>
+void Product(T xr, T xi, T yr, T yi, T& re, T& im)
+{
+    re = xr * yr - xi * yi;
+    im = xr * yi + xi * yr;
+}
+
 }  // namespace detail
 
 template <class T>
@@ -125,9 +135,6 @@ void SubConstantRev_InPlace(unsigned int count, std::complex<T>* srcDst, std::co
     SubConstantRev(count, srcDst, constant, srcDst);
 }
 
-// The product x * y on the components: four products, each rounded, then one
-// difference and one sum. Every product member goes through this loop, so
-// MulConstant equals Mul by a vector of equal elements, bit for bit.
 template <class T>
 void Mul(unsigned int count, const std::complex<T>* a, const std::complex<T>* b, std::complex<T>* dst)
 {
@@ -135,10 +142,8 @@ void Mul(unsigned int count, const std::complex<T>* a, const std::complex<T>* b,
     const T* y = detail::Components(b);
     T* out = detail::Components(dst);
     for (std::size_t i = 0; i < count; ++i) {
-        const T xr = x[2 * i], xi = x[2 * i + 1];
-        const T yr = y[2 * i], yi = y[2 * i + 1];
-        const T re = xr * yr - xi * yi;
-        const T im = xr * yi + xi * yr;
+        T re, im;
+        detail::Product(x[2 * i], x[2 * i + 1], y[2 * i], y[2 * i + 1], re, im);
         out[2 * i] = re;
         out[2 * i + 1] = im;
     }
@@ -157,9 +162,8 @@ void MulConstant(unsigned int count, const std::complex<T>* src, std::complex<T>
     const T* x = detail::Components(src);
     T* out = detail::Components(dst);
     for (std::size_t i = 0; i < count; ++i) {
-        const T xr = x[2 * i], xi = x[2 * i + 1];
-        const T re = xr * yr - xi * yi;
-        const T im = xr * yi + xi * yr;
+        T re, im;
+        detail::Product(x[2 * i], x[2 * i + 1], yr, yi, re, im);
         out[2 * i] = re;
         out[2 * i + 1] = im;
     }
@@ -179,10 +183,8 @@ void AddProduct(unsigned int count, const std::complex<T>* a, const std::complex
     const T* y = detail::Components(b);
     T* io = detail::Components(srcDst);
     for (std::size_t i = 0; i < count; ++i) {
-        const T xr = x[2 * i], xi = x[2 * i + 1];
-        const T yr = y[2 * i], yi = y[2 * i + 1];
-        const T pr = xr * yr - xi * yi;
-        const T pi = xr * yi + xi * yr;
+        T pr, pi;
+        detail::Product(x[2 * i], x[2 * i + 1], y[2 * i], y[2 * i + 1], pr, pi);
         const T re = pr + io[2 * i];
         const T im = pi + io[2 * i + 1];
         io[2 * i] = re;
