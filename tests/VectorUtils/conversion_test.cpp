@@ -305,7 +305,7 @@ const unsigned int kCounts[] = {0, 1, 7, 16, 33, 4099};
 template <class Real, class Dst>
 void CheckFromReal(std::uint32_t seedBase)
 {
-    for (int scale : {0, 1, -1, -7, -8, -15, -16, -23, -24, -31, -32, 3, -40}) {
+    for (int scale : {0, 1, -1, -7, -8, -15, -16, -23, -24, -30, -31, -32, 3, -40, 140}) {
         for (bool round : {false, true}) {
             for (unsigned int n : kCounts) {
                 const std::uint32_t seed = seedBase + 7 * n + static_cast<std::uint32_t>(scale + 64);

@@ -94,11 +94,38 @@ inline int StoreInt32<int>(int value)
 }
 
 // The limit on the source: anything at or beyond +-1 becomes exactly +-m; a
-// NaN fails both tests and is scaled like any other value.
+// NaN fails both tests and is scaled like any other value. Taken as written
+// for the multipliers above 2^30, whose products need the range test.
 inline float LimitAndScale(float x, float m)
 {
     return x >= 1.0f ? m : (x <= -1.0f ? -m : x * m);
 }
+
+// The limit and scale for multipliers up to 2^30 (every scale from -30 up),
+// the common case, in fewer vector operations. A source inside (-1, 1)
+// scales to less than 2^30 in magnitude, so its product converts without a
+// range test, and so does the product doubled: rounding half away from zero
+// is then trunc(2v) - trunc(v), since doubling is exact and trunc(2v) differs
+// from 2 trunc(v) by exactly one where the fraction reaches one half. Sources
+// at or beyond +-1 take the integers of +-m, fixed for the call; a NaN takes
+// kIndefinite, the indefinite value or, where the store keeps only the low
+// bits (all zero in it), plain 0, which spares a select.
+template <bool kRound, int kIndefinite>
+inline int LimitAndScaleToInt32(float x, float m, int high, int low)
+{
+    const float magnitude = std::fabs(x);
+    const bool inside = magnitude < 1.0f;
+    const float v = inside ? x * m : 0.0f;
+    const int scaled = kRound ? static_cast<int>(v + v) - static_cast<int>(v) : static_cast<int>(v);
+    const int limited = low ^ (x > 0.0f ? high ^ low : 0);
+    const int outside = magnitude >= 1.0f ? limited : kIndefinite;
+    return inside ? scaled : outside;
+}
+
+constexpr float kShortPathMultiplier = 1073741824.0f;  // 2^30
+
+template <class Dst>
+constexpr int kIndefiniteAfterStore = sizeof(Dst) <= sizeof(short) ? 0 : INT_MIN;
 
 // 2^-scale for integer sources, from the double pow. The exponent is negated
 // as an integer, wrapping as the hardware does for the lowest int.
@@ -168,7 +195,15 @@ void FloatToIntegerUnscaled(unsigned int count, const float* src, Dst* dst)
 template <bool kRound, class Dst>
 void FloatToIntegerScaled(unsigned int count, const float* src, Dst* dst, float m)
 {
-    StoreEach(count, src, dst, [m](float x) { return ToInt32<kRound>(LimitAndScale(x, m)); });
+    if (m <= kShortPathMultiplier) {
+        const int high = ToInt32<kRound>(m);
+        const int low = ToInt32<kRound>(-m);
+        StoreEach(count, src, dst, [=](float x) {
+            return LimitAndScaleToInt32<kRound, kIndefiniteAfterStore<Dst>>(x, m, high, low);
+        });
+    } else {
+        StoreEach(count, src, dst, [m](float x) { return ToInt32<kRound>(LimitAndScale(x, m)); });
+    }
 }
 
 template <class Dst>
