@@ -109,6 +109,16 @@ void FloatToShortVolk(benchmark::State& state)
     Loop(state, [&] { volk_32f_s32f_convert_16i(dst.data(), src.data(), 32768.0f, n); });
 }
 
+// VOLK's SSE2 kernel: the same instruction set as our baseline build, where
+// the dispatched kernel above may use AVX2.
+void FloatToShortVolkSse2(benchmark::State& state)
+{
+    const auto n = static_cast<unsigned int>(state.range(0));
+    const auto src = RandomData<float>(n, 2, -1.05f, 1.05f);
+    std::vector<short> dst(n);
+    Loop(state, [&] { volk_32f_s32f_convert_16i_manual(dst.data(), src.data(), 32768.0f, n, "u_sse2"); });
+}
+
 void InterleaveVolk(benchmark::State& state)
 {
     const auto n = static_cast<unsigned int>(state.range(0));
@@ -158,6 +168,8 @@ const bool registered = [] {
     benchmark::RegisterBenchmark(Name("Convert_s16_f32_scale15", "volk").c_str(), ShortToFloatVolk)->Arg(kFrames);
     benchmark::RegisterBenchmark(Name("Convert_f32_s16_trunc", "volk").c_str(), FloatToShortVolk)->Arg(kFrames);
     benchmark::RegisterBenchmark(Name("Convert_f32_s16_round", "volk").c_str(), FloatToShortVolk)->Arg(kFrames);
+    for (const char* kernel : {"Convert_f32_s16_trunc", "Convert_f32_s16_round"})
+        benchmark::RegisterBenchmark(Name(kernel, "volk_sse2").c_str(), FloatToShortVolkSse2)->Arg(kFrames);
     benchmark::RegisterBenchmark(Name("Interleave_f32_stereo", "volk").c_str(), InterleaveVolk)->Arg(kFrames);
     benchmark::RegisterBenchmark(Name("Deinterleave_f32_stereo", "volk").c_str(), DeinterleaveVolk)->Arg(kFrames);
 #endif
