@@ -34,7 +34,7 @@ std::vector<E> Part(const std::vector<E>& pairs, unsigned int which)
 }
 
 // In place, from a distinct interleaved source, and split arrays through a
-// work array of pairs.
+// work array.
 TYPED_TEST(FFTKernelTyped, ComplexMatchesReferenceEveryOrder)
 {
     using E = TypeParam;
@@ -53,13 +53,13 @@ TYPED_TEST(FFTKernelTyped, ComplexMatchesReferenceEveryOrder)
             if (inverse) {
                 fft_reference::Inverse(plan, expected.data());
                 ComplexFFTInverse(plan, inPlace.data());
-                InverseInto<E, true>(plan, input.data(), input.data() + 1, into.data(), into.data() + 1);
-                SplitInverseVia(plan, re.data(), im.data(), work.data(), outRe.data(), outIm.data());
+                PairsInto<E, true>(plan, input.data(), into.data());
+                SplitVia<E, true>(plan, re.data(), im.data(), work.data(), outRe.data(), outIm.data());
             } else {
                 fft_reference::Forward(plan, expected.data());
                 ComplexFFTForward(plan, inPlace.data());
-                ForwardInto<E, true>(plan, input.data(), input.data() + 1, into.data(), into.data() + 1);
-                SplitForwardVia(plan, re.data(), im.data(), work.data(), outRe.data(), outIm.data());
+                PairsInto<E, false>(plan, input.data(), into.data());
+                SplitVia<E, false>(plan, re.data(), im.data(), work.data(), outRe.data(), outIm.data());
             }
             ASSERT_TRUE(SameBitsArray(expected, inPlace)) << "in place";
             ASSERT_TRUE(SameBitsArray(expected, into)) << "into";

@@ -1,22 +1,21 @@
 #pragma once
 
-// The in-place power-of-two complex transform: decimation in time, radix 2,
-// on data put in bit-reversed order first. Forward is unscaled with
-// exp(-2 pi i k n / N); the inverse conjugates, runs the forward transform
-// and scales by 1/N.
+// The power-of-two complex transform: decimation in time, radix 2, on data
+// in bit-reversed order. Forward is unscaled with exp(-2 pi i k n / N); the
+// inverse conjugates the input, runs the forward transform and multiplies
+// the real parts by 1/N and the imaginary parts by -1/N.
 //
-// Every butterfly is the radix-2 butterfly of the plain loop nest (twiddle
-// loop outside, strided butterfly loop inside), with the same operands in
-// the same order; only the order in which the independent butterflies of a
-// stage run differs. So the results are the same bits:
-// - stages 1 to 3 run together on each group of 8 points, held in locals;
+// The butterflies of a stage are independent, so they run in an order that
+// suits the machine (Butterflies.h says why the bits stay the same):
+// - the permutation and stages 1 and 2 (or 1 to 3) run as one pass over
+//   groups of 4 (or 8) points held in locals (FirstPassKernels.h);
 // - later stages run in pairs: four points a quarter block apart pass
-//   through both stages before they are stored again;
-// - the butterfly loop runs over consecutive points, so it vectorises.
-// The kernels serve two layouts: interleaved (re, im) pairs, where point k
-// is re[2k], re[2k + 1] and the im pointer is not read (so that g++ sees one
-// interleaved group and vectorises it), and split arrays, where point k is
-// re[k], im[k].
+//   through both stages before they are stored again, and the butterfly
+//   loop runs over consecutive points, so it vectorises;
+// - the stages work on split arrays or on the blocked form, never on
+//   interleaved pairs, which would cost a shuffle per vector; the last pair
+//   of stages writes the result in the form the caller asked for, scaled
+//   there when the inverse needs it.
 //
 // The loop kernels are kept out of line: inlined into their caller, g++
 // loses what their restrict parameters promise and leaves them scalar.
@@ -24,142 +23,13 @@
 #include <cstddef>
 #include <cstdint>
 
+#include "transform/FFT/Butterflies.h"
 #include "transform/FFT/FFTPlan.h"
+#include "transform/FFT/FirstPassKernels.h"
 
 namespace kestaccel {
 namespace transform {
 namespace cpp {
-
-template <bool kPairs>
-struct Layout;
-
-template <>
-struct Layout<true> {
-    static constexpr std::size_t kStep = 2;
-    template <class P>
-    static P& Re(P* re, P*, std::size_t k) { return re[2 * k]; }
-    template <class P>
-    static P& Im(P* re, P*, std::size_t k) { return re[2 * k + 1]; }
-};
-
-template <>
-struct Layout<false> {
-    static constexpr std::size_t kStep = 1;
-    template <class P>
-    static P& Re(P* re, P*, std::size_t k) { return re[k]; }
-    template <class P>
-    static P& Im(P*, P* im, std::size_t k) { return im[k]; }
-};
-
-// The bit-reversal exchanges, walked upwards through the swap table. An
-// entry equal to its index exchanges the point with itself, which changes
-// nothing; doing so unconditionally saves a branch that mispredicts half
-// the time.
-template <class E, bool kPairs>
-void SwapByTable(std::size_t n, const std::uint32_t* __restrict table, E* __restrict re, E* __restrict im)
-{
-    using L = Layout<kPairs>;
-    for (std::size_t i = 0; i + 1 < n; ++i) {
-        const std::size_t p = table[i];
-        const E r = L::Re(re, im, i), m = L::Im(re, im, i);
-        L::Re(re, im, i) = L::Re(re, im, p);
-        L::Im(re, im, i) = L::Im(re, im, p);
-        L::Re(re, im, p) = r;
-        L::Im(re, im, p) = m;
-    }
-}
-
-// (x, y) becomes (x + y, x - y).
-template <class E>
-inline void SumDifference(E& xr, E& xi, E& yr, E& yi)
-{
-    const E ar = xr, ai = xi;
-    xr = ar + yr;
-    xi = ai + yi;
-    yr = ar - yr;
-    yi = ai - yi;
-}
-
-// (x, y) becomes (x - i y, x + i y): the butterfly with the factor -i,
-// written without multiplications.
-template <class E>
-inline void MinusIButterfly(E& xr, E& xi, E& yr, E& yi)
-{
-    const E ar = xr, ai = xi, br = yr, bi = yi;
-    xr = ar + bi;
-    xi = ai - br;
-    yr = ar - bi;
-    yi = ai + br;
-}
-
-// (x, y) becomes (x + y w, x - y w), the product formed as
-// (yr wr - yi wi, yr wi + yi wr).
-template <class E>
-inline void Butterfly(E& xr, E& xi, E& yr, E& yi, E wr, E wi)
-{
-    const E tr = yr * wr - yi * wi;
-    const E ti = yr * wi + yi * wr;
-    yr = xr - tr;
-    yi = xi - ti;
-    xr = xr + tr;
-    xi = xi + ti;
-}
-
-// Stages 1 and 2 on each group of 4 points.
-template <class E, bool kPairs>
-[[gnu::noinline]] void StagesOneTwo(std::size_t groups, E* __restrict re, E* __restrict im)
-{
-    using L = Layout<kPairs>;
-    for (std::size_t g = 0; g < groups; ++g) {
-        const std::size_t b = 4 * g;
-        E r[4], m[4];
-        for (std::size_t t = 0; t < 4; ++t) {
-            r[t] = L::Re(re, im, b + t);
-            m[t] = L::Im(re, im, b + t);
-        }
-        SumDifference(r[0], m[0], r[1], m[1]);
-        SumDifference(r[2], m[2], r[3], m[3]);
-        SumDifference(r[0], m[0], r[2], m[2]);
-        MinusIButterfly(r[1], m[1], r[3], m[3]);
-        for (std::size_t t = 0; t < 4; ++t) {
-            L::Re(re, im, b + t) = r[t];
-            L::Im(re, im, b + t) = m[t];
-        }
-    }
-}
-
-// Stages 1, 2 and 3 on each group of 8 points; w holds the four stage-3
-// factors as (re, im) pairs.
-template <class E, bool kPairs>
-[[gnu::noinline]] void StagesOneToThree(std::size_t groups, E* __restrict re, E* __restrict im, const E* __restrict w)
-{
-    using L = Layout<kPairs>;
-    const E w0r = w[0], w0i = w[1], w1r = w[2], w1i = w[3], w2r = w[4], w2i = w[5], w3r = w[6], w3i = w[7];
-    for (std::size_t g = 0; g < groups; ++g) {
-        const std::size_t b = 8 * g;
-        E r[8], m[8];
-        for (std::size_t t = 0; t < 8; ++t) {
-            r[t] = L::Re(re, im, b + t);
-            m[t] = L::Im(re, im, b + t);
-        }
-        SumDifference(r[0], m[0], r[1], m[1]);
-        SumDifference(r[2], m[2], r[3], m[3]);
-        SumDifference(r[4], m[4], r[5], m[5]);
-        SumDifference(r[6], m[6], r[7], m[7]);
-        SumDifference(r[0], m[0], r[2], m[2]);
-        MinusIButterfly(r[1], m[1], r[3], m[3]);
-        SumDifference(r[4], m[4], r[6], m[6]);
-        MinusIButterfly(r[5], m[5], r[7], m[7]);
-        Butterfly(r[0], m[0], r[4], m[4], w0r, w0i);
-        Butterfly(r[1], m[1], r[5], m[5], w1r, w1i);
-        Butterfly(r[2], m[2], r[6], m[6], w2r, w2i);
-        Butterfly(r[3], m[3], r[7], m[7], w3r, w3i);
-        for (std::size_t t = 0; t < 8; ++t) {
-            L::Re(re, im, b + t) = r[t];
-            L::Im(re, im, b + t) = m[t];
-        }
-    }
-}
 
 // The factors of a stage are gathered from the strided table into small
 // split arrays, a chunk of kChunk butterfly positions at a time, so that
@@ -184,351 +54,315 @@ struct FactorChunk {
 // Two consecutive stages s and s + 1 over blocks of 4q points, q the half
 // span of stage s. Points j, j + q, j + 2q, j + 3q: stage s pairs the first
 // two and the last two with factor a[j]; stage s + 1 then pairs j with
-// j + 2q (factor b[j]) and j + q with j + 3q (factor c[j]).
-template <class E, bool kPairs>
+// j + 2q (factor b[j]) and j + q with j + 3q (factor c[j]). The four
+// streams start at r0 .. r3 (and i0 .. i3 in the split form).
+template <class E, Form F>
 [[gnu::noinline]] void StagePairRun(std::size_t blocks, std::size_t span, std::size_t count, E* __restrict r0,
                                     E* __restrict i0, E* __restrict r1, E* __restrict i1, E* __restrict r2,
                                     E* __restrict i2, E* __restrict r3, E* __restrict i3, const E* __restrict ar_,
                                     const E* __restrict ai_, const E* __restrict br_, const E* __restrict bi_,
                                     const E* __restrict cr_, const E* __restrict ci_)
 {
-    using L = Layout<kPairs>;
+    using P = Points<E, F>;
+    constexpr std::size_t lanes = kLanes<E>;
     for (std::size_t b = 0; b < blocks; ++b) {
         const std::size_t o = b * span;
-        for (std::size_t j = 0; j < count; ++j) {
-            const std::size_t k = o + j;
-            E ar = L::Re(r0, i0, k), ai = L::Im(r0, i0, k), br = L::Re(r1, i1, k), bi = L::Im(r1, i1, k);
-            E cr = L::Re(r2, i2, k), ci = L::Im(r2, i2, k), dr = L::Re(r3, i3, k), di = L::Im(r3, i3, k);
-            Butterfly(ar, ai, br, bi, ar_[j], ai_[j]);
-            Butterfly(cr, ci, dr, di, ar_[j], ai_[j]);
-            Butterfly(ar, ai, cr, ci, br_[j], bi_[j]);
-            Butterfly(br, bi, dr, di, cr_[j], ci_[j]);
-            L::Re(r0, i0, k) = ar;
-            L::Im(r0, i0, k) = ai;
-            L::Re(r1, i1, k) = br;
-            L::Im(r1, i1, k) = bi;
-            L::Re(r2, i2, k) = cr;
-            L::Im(r2, i2, k) = ci;
-            L::Re(r3, i3, k) = dr;
-            L::Im(r3, i3, k) = di;
+        for (std::size_t j = 0; j < count; j += lanes) {
+            for (std::size_t t = 0; t < lanes; ++t) {
+                const std::size_t k = o + j;
+                E ar = P::Re(r0, i0, k, t), ai = P::Im(r0, i0, k, t), br = P::Re(r1, i1, k, t), bi = P::Im(r1, i1, k, t);
+                E cr = P::Re(r2, i2, k, t), ci = P::Im(r2, i2, k, t), dr = P::Re(r3, i3, k, t), di = P::Im(r3, i3, k, t);
+                Butterfly(ar, ai, br, bi, ar_[j + t], ai_[j + t]);
+                Butterfly(cr, ci, dr, di, ar_[j + t], ai_[j + t]);
+                Butterfly(ar, ai, cr, ci, br_[j + t], bi_[j + t]);
+                Butterfly(br, bi, dr, di, cr_[j + t], ci_[j + t]);
+                P::Re(r0, i0, k, t) = ar;
+                P::Im(r0, i0, k, t) = ai;
+                P::Re(r1, i1, k, t) = br;
+                P::Im(r1, i1, k, t) = bi;
+                P::Re(r2, i2, k, t) = cr;
+                P::Im(r2, i2, k, t) = ci;
+                P::Re(r3, i3, k, t) = dr;
+                P::Im(r3, i3, k, t) = di;
+            }
         }
     }
 }
 
-// The last two stages: a single block of 4q = N points, whose factors are
-// the table itself at strides 2 and 1, read in place instead of gathered.
-template <class E, bool kPairs>
-[[gnu::noinline]] void LastStagePairRun(std::size_t q, E* __restrict r0, E* __restrict i0, E* __restrict r1,
-                                        E* __restrict i1, E* __restrict r2, E* __restrict i2, E* __restrict r3,
-                                        E* __restrict i3, const E* __restrict tw, const E* __restrict twUpper)
-{
-    using L = Layout<kPairs>;
-    for (std::size_t j = 0; j < q; ++j) {
-        E ar = L::Re(r0, i0, j), ai = L::Im(r0, i0, j), br = L::Re(r1, i1, j), bi = L::Im(r1, i1, j);
-        E cr = L::Re(r2, i2, j), ci = L::Im(r2, i2, j), dr = L::Re(r3, i3, j), di = L::Im(r3, i3, j);
-        const E war = tw[4 * j], wai = tw[4 * j + 1];
-        Butterfly(ar, ai, br, bi, war, wai);
-        Butterfly(cr, ci, dr, di, war, wai);
-        Butterfly(ar, ai, cr, ci, tw[2 * j], tw[2 * j + 1]);
-        Butterfly(br, bi, dr, di, twUpper[2 * j], twUpper[2 * j + 1]);
-        L::Re(r0, i0, j) = ar;
-        L::Im(r0, i0, j) = ai;
-        L::Re(r1, i1, j) = br;
-        L::Im(r1, i1, j) = bi;
-        L::Re(r2, i2, j) = cr;
-        L::Im(r2, i2, j) = ci;
-        L::Re(r3, i3, j) = dr;
-        L::Im(r3, i3, j) = di;
-    }
-}
-
-// Point k of the layout starts at element k * kStep of both pointers.
-template <bool kPairs>
-constexpr std::size_t Offset(std::size_t k)
-{
-    return k * Layout<kPairs>::kStep;
-}
-
-template <class E, bool kPairs>
+template <class E, Form F>
 void StagePair(const FFTPlan<E>& plan, std::uint32_t s, E* re, E* im)
 {
+    using P = Points<E, F>;
     const std::size_t n = plan.size;
     const std::size_t q = std::size_t(1) << (s - 1);
     const std::size_t strideB = std::size_t(1) << (plan.order - s - 1);
-    if (4 * q == n) {
-        LastStagePairRun<E, kPairs>(q, re, im, re + Offset<kPairs>(q), im + Offset<kPairs>(q), re + Offset<kPairs>(2 * q),
-                                    im + Offset<kPairs>(2 * q), re + Offset<kPairs>(3 * q), im + Offset<kPairs>(3 * q),
-                                    plan.twiddles, plan.twiddles + 2 * q);
-        return;
-    }
     FactorChunk<E> a, b, c;
     for (std::size_t j0 = 0; j0 < q; j0 += kChunk) {
         const std::size_t count = q - j0 < kChunk ? q - j0 : kChunk;
         a.Gather(plan.twiddles, j0, count, 2 * strideB);
         b.Gather(plan.twiddles, j0, count, strideB);
         c.Gather(plan.twiddles, j0 + q, count, strideB);
-        StagePairRun<E, kPairs>(n / (4 * q), 4 * q, count, re + Offset<kPairs>(j0), im + Offset<kPairs>(j0),
-                                re + Offset<kPairs>(j0 + q), im + Offset<kPairs>(j0 + q),
-                                re + Offset<kPairs>(j0 + 2 * q), im + Offset<kPairs>(j0 + 2 * q),
-                                re + Offset<kPairs>(j0 + 3 * q), im + Offset<kPairs>(j0 + 3 * q), a.re, a.im, b.re,
-                                b.im, c.re, c.im);
+        const std::size_t o0 = P::Offset(j0), o1 = P::Offset(j0 + q), o2 = P::Offset(j0 + 2 * q),
+                          o3 = P::Offset(j0 + 3 * q);
+        StagePairRun<E, F>(n / (4 * q), 4 * q, count, re + o0, im + o0, re + o1, im + o1, re + o2, im + o2, re + o3,
+                           im + o3, a.re, a.im, b.re, b.im, c.re, c.im);
     }
 }
 
-// The bit-reversal permutation as a copy between distinct arrays, from the
-// swap table alone, with the result of a copy followed by the exchanges in
-// place. kConjugate negates the imaginary parts on the way, as the inverse
-// needs; the layouts of source and destination may differ.
-//
-// Small transforms walk the table downwards and write both partners of
-// every entry: each point ends at its place, because an entry equal to its
-// index whose partner lies below is rewritten later by that partner's
-// entry. Large ones, whose arrays overflow the caches, copy straight first
-// and then let every entry exchange its two points from the source, tile by
-// tile: 2^kTileBits high index bits by 2^kTileBits low ones, so that the
-// points of a tile and their partners share a few cache lines. There an
-// entry equal to its index stores the destination's own value back instead
-// of branching, and the order of the entries no longer matters.
-constexpr std::uint32_t kTileBits = 4;
-constexpr std::uint32_t kLargestUntiledOrder = 12;
+// Where the last stages leave the result: over the working array in its
+// own form; over it as interleaved pairs (a block covers the same bytes as
+// its points in pairs); or in separate split arrays. With kScale the real
+// parts are multiplied by scale and the imaginary parts by -scale, which
+// undoes the inverse's conjugation and divides by N in one step.
+enum class Output { kInPlace, kPairsInPlace, kSplitArrays };
 
-template <class E, bool kSrcPairs, bool kConjugate>
-inline E SourceIm(const E* srcRe, const E* srcIm, std::size_t k)
-{
-    const E v = Layout<kSrcPairs>::Im(srcRe, srcIm, k);
-    return kConjugate ? -v : v;
-}
+template <class E, Form F, Output kOut, bool kScale>
+struct Writer {
+    E scale;
+    E negScale;
 
-template <class E, bool kSrcPairs, bool kDstPairs, bool kConjugate>
-[[gnu::noinline]] void ScatterDownwards(std::size_t n, const std::uint32_t* __restrict table,
-                                        const E* __restrict srcRe, const E* __restrict srcIm, E* __restrict dstRe,
-                                        E* __restrict dstIm)
-{
-    using S = Layout<kSrcPairs>;
-    using D = Layout<kDstPairs>;
-    D::Re(dstRe, dstIm, n - 1) = S::Re(srcRe, srcIm, n - 1);
-    D::Im(dstRe, dstIm, n - 1) = SourceIm<E, kSrcPairs, kConjugate>(srcRe, srcIm, n - 1);
-    for (std::size_t i = n - 1; i-- > 0;) {
-        const std::size_t p = table[i];
-        const E pr = S::Re(srcRe, srcIm, p), ir = S::Re(srcRe, srcIm, i);
-        const E pi = SourceIm<E, kSrcPairs, kConjugate>(srcRe, srcIm, p);
-        const E ii = SourceIm<E, kSrcPairs, kConjugate>(srcRe, srcIm, i);
-        D::Re(dstRe, dstIm, i) = pr;
-        D::Im(dstRe, dstIm, i) = pi;
-        D::Re(dstRe, dstIm, p) = ir;
-        D::Im(dstRe, dstIm, p) = ii;
+    // Point start + t of a stream held at re/im in the working array; the
+    // split output of that stream starts at outRe/outIm.
+    void Put(E* re, E* im, E* outRe, E* outIm, std::size_t start, std::size_t t, E xr, E xi) const
+    {
+        const E yr = kScale ? xr * scale : xr;
+        const E yi = kScale ? xi * negScale : xi;
+        if constexpr (kOut == Output::kInPlace) {
+            Points<E, F>::Re(re, im, start, t) = yr;
+            Points<E, F>::Im(re, im, start, t) = yi;
+        } else if constexpr (kOut == Output::kPairsInPlace) {
+            Points<E, Form::kPairs>::Re(re, im, start, t) = yr;
+            Points<E, Form::kPairs>::Im(re, im, start, t) = yi;
+        } else {
+            outRe[start + t] = yr;
+            outIm[start + t] = yi;
+        }
     }
-}
+};
 
-template <class E, bool kSrcPairs, bool kDstPairs, bool kConjugate>
-[[gnu::noinline]] void CopyLayout(std::size_t n, const E* __restrict srcRe, const E* __restrict srcIm,
-                                  E* __restrict dstRe, E* __restrict dstIm)
+// The last two stages: a single block of 4q = N points, whose factors are
+// the table itself at strides 2 and 1, read in place instead of gathered.
+// Each block of points is read whole before anything is written, since
+// the pair output rewrites the bytes of the block in another order.
+template <class E, Form F, Output kOut, bool kScale>
+[[gnu::noinline]] void LastStagePairRun(std::size_t q, E* __restrict r0, E* __restrict i0, E* __restrict r1,
+                                        E* __restrict i1, E* __restrict r2, E* __restrict i2, E* __restrict r3,
+                                        E* __restrict i3, const E* __restrict tw, const E* __restrict twUpper,
+                                        E* __restrict o0r, E* __restrict o0i, E* __restrict o1r, E* __restrict o1i,
+                                        E* __restrict o2r, E* __restrict o2i, E* __restrict o3r, E* __restrict o3i,
+                                        E scale)
 {
-    using S = Layout<kSrcPairs>;
-    using D = Layout<kDstPairs>;
-    for (std::size_t i = 0; i < n; ++i) {
-        D::Re(dstRe, dstIm, i) = S::Re(srcRe, srcIm, i);
-        D::Im(dstRe, dstIm, i) = SourceIm<E, kSrcPairs, kConjugate>(srcRe, srcIm, i);
-    }
-}
-
-template <class E, bool kSrcPairs, bool kDstPairs, bool kConjugate>
-[[gnu::noinline]] void ExchangeTiles(std::size_t n, std::uint32_t order, const std::uint32_t* __restrict table,
-                                     const E* __restrict srcRe, const E* __restrict srcIm, E* __restrict dstRe,
-                                     E* __restrict dstIm)
-{
-    using S = Layout<kSrcPairs>;
-    using D = Layout<kDstPairs>;
-    const std::size_t tile = std::size_t(1) << kTileBits;
-    const std::size_t middles = std::size_t(1) << (order - 2 * kTileBits);
-    const std::uint32_t highShift = order - kTileBits;
-    for (std::size_t m = 0; m < middles; ++m) {
-        for (std::size_t a = 0; a < tile; ++a) {
-            const std::size_t first = (a << highShift) | (m << kTileBits);
-            // The last point is its own partner and has no entry.
-            const std::size_t end = first + tile < n - 1 ? first + tile : n - 1;
-            for (std::size_t i = first; i < end; ++i) {
-                const std::size_t p = table[i];
-                const bool exchange = p != i;
-                const E pr = S::Re(srcRe, srcIm, p), ir = S::Re(srcRe, srcIm, i);
-                const E pi = SourceIm<E, kSrcPairs, kConjugate>(srcRe, srcIm, p);
-                const E ii = SourceIm<E, kSrcPairs, kConjugate>(srcRe, srcIm, i);
-                const E cr = D::Re(dstRe, dstIm, i), ci = D::Im(dstRe, dstIm, i);
-                D::Re(dstRe, dstIm, i) = exchange ? pr : cr;
-                D::Im(dstRe, dstIm, i) = exchange ? pi : ci;
-                D::Re(dstRe, dstIm, p) = exchange ? ir : cr;
-                D::Im(dstRe, dstIm, p) = exchange ? ii : ci;
-            }
+    using P = Points<E, F>;
+    constexpr std::size_t lanes = kLanes<E>;
+    const Writer<E, F, kOut, kScale> out{scale, -scale};
+    for (std::size_t j = 0; j < q; j += lanes) {
+        E ar[lanes], ai[lanes], br[lanes], bi[lanes], cr[lanes], ci[lanes], dr[lanes], di[lanes];
+        for (std::size_t t = 0; t < lanes; ++t) {
+            ar[t] = P::Re(r0, i0, j, t), ai[t] = P::Im(r0, i0, j, t), br[t] = P::Re(r1, i1, j, t);
+            bi[t] = P::Im(r1, i1, j, t), cr[t] = P::Re(r2, i2, j, t), ci[t] = P::Im(r2, i2, j, t);
+            dr[t] = P::Re(r3, i3, j, t), di[t] = P::Im(r3, i3, j, t);
+        }
+        for (std::size_t t = 0; t < lanes; ++t) {
+            const std::size_t u = j + t;
+            const E war = tw[4 * u], wai = tw[4 * u + 1];
+            Butterfly(ar[t], ai[t], br[t], bi[t], war, wai);
+            Butterfly(cr[t], ci[t], dr[t], di[t], war, wai);
+            Butterfly(ar[t], ai[t], cr[t], ci[t], tw[2 * u], tw[2 * u + 1]);
+            Butterfly(br[t], bi[t], dr[t], di[t], twUpper[2 * u], twUpper[2 * u + 1]);
+        }
+        for (std::size_t t = 0; t < lanes; ++t) {
+            out.Put(r0, i0, o0r, o0i, j, t, ar[t], ai[t]);
+            out.Put(r1, i1, o1r, o1i, j, t, br[t], bi[t]);
+            out.Put(r2, i2, o2r, o2i, j, t, cr[t], ci[t]);
+            out.Put(r3, i3, o3r, o3i, j, t, dr[t], di[t]);
         }
     }
 }
 
-template <class E, bool kSrcPairs, bool kDstPairs, bool kConjugate>
-void PermuteInto(std::size_t n, std::uint32_t order, const std::uint32_t* table, const E* srcRe, const E* srcIm,
-                 E* dstRe, E* dstIm)
+// When the first pass took every stage (4 or 8 points), only the output
+// step remains.
+template <class E, Form F, Output kOut, bool kScale>
+[[gnu::noinline]] void WriteOut(std::size_t n, E* __restrict re, E* __restrict im, E* __restrict outRe,
+                                E* __restrict outIm, E scale)
 {
-    if (order <= kLargestUntiledOrder) {
-        ScatterDownwards<E, kSrcPairs, kDstPairs, kConjugate>(n, table, srcRe, srcIm, dstRe, dstIm);
-        return;
+    using P = Points<E, F>;
+    constexpr std::size_t lanes = kLanes<E>;
+    const Writer<E, F, kOut, kScale> out{scale, -scale};
+    for (std::size_t j = 0; j < n; j += lanes) {
+        E xr[lanes], xi[lanes];
+        for (std::size_t t = 0; t < lanes; ++t) {
+            xr[t] = P::Re(re, im, j, t);
+            xi[t] = P::Im(re, im, j, t);
+        }
+        for (std::size_t t = 0; t < lanes; ++t) out.Put(re, im, outRe, outIm, j, t, xr[t], xi[t]);
     }
-    CopyLayout<E, kSrcPairs, kDstPairs, kConjugate>(n, srcRe, srcIm, dstRe, dstIm);
-    ExchangeTiles<E, kSrcPairs, kDstPairs, kConjugate>(n, order, table, srcRe, srcIm, dstRe, dstIm);
 }
 
-// Everything after the permutation: the stages, on data in bit-reversed
-// order.
-template <class E, bool kPairs>
-void Stages(const FFTPlan<E>& plan, E* re, E* im)
+// The stages from s on, on the working array after the first pass; the
+// last pair writes the output.
+template <class E, Form F, Output kOut, bool kScale>
+void RemainingStages(const FFTPlan<E>& plan, std::uint32_t s, E* re, E* im, E* outRe, E* outIm, E scale)
 {
+    using P = Points<E, F>;
     const std::size_t n = plan.size;
-    const std::uint32_t order = plan.order;
-    if (order == 1) {
-        SumDifference(Layout<kPairs>::Re(re, im, 0), Layout<kPairs>::Im(re, im, 0), Layout<kPairs>::Re(re, im, 1),
-                      Layout<kPairs>::Im(re, im, 1));
+    if (s > plan.order) {
+        if (kOut != Output::kInPlace || kScale) WriteOut<E, F, kOut, kScale>(n, re, im, outRe, outIm, scale);
         return;
     }
-    // The stages after the first pass run in pairs; the first pass takes
-    // two or three stages so that an even number remains.
-    std::uint32_t s;
-    if ((order & 1u) == 0) {
-        StagesOneTwo<E, kPairs>(n / 4, re, im);
-        s = 3;
+    for (; s + 1 < plan.order; s += 2) StagePair<E, F>(plan, s, re, im);
+    const std::size_t q = n / 4;
+    const std::size_t o1 = P::Offset(q), o2 = P::Offset(2 * q), o3 = P::Offset(3 * q);
+    // Output streams exist only for split arrays; null pointers stay unused.
+    const auto at = [](E* p, std::size_t k) { return p == nullptr ? p : p + k; };
+    LastStagePairRun<E, F, kOut, kScale>(q, re, im, re + o1, im + o1, re + o2, im + o2, re + o3, im + o3,
+                                         plan.twiddles, plan.twiddles + 2 * q, outRe, outIm, at(outRe, q),
+                                         at(outIm, q), at(outRe, 2 * q), at(outIm, 2 * q), at(outRe, 3 * q),
+                                         at(outIm, 3 * q), scale);
+}
+
+// The four stage-3 factors of a plan (at an eighth of its table apart), for
+// the first pass of an odd order.
+template <class E>
+struct StageThreeFactors {
+    E w[8] = {};
+
+    explicit StageThreeFactors(const FFTPlan<E>& plan)
+    {
+        if ((plan.order & 1u) == 0) return;
+        const std::size_t stride = std::size_t(1) << (plan.order - 3);
+        for (std::size_t t = 0; t < 4; ++t) {
+            w[2 * t] = plan.twiddles[2 * t * stride];
+            w[2 * t + 1] = plan.twiddles[2 * t * stride + 1];
+        }
+    }
+};
+
+// Transforms of 2 points: one butterfly, with the inverse's conjugation
+// and scaling around it.
+template <class E, bool kInverse>
+void TwoPoints(const E* srcRe, const E* srcIm, std::size_t srcStep, E* re, E* im, std::size_t step)
+{
+    E xr = srcRe[0], xi = srcIm[0], yr = srcRe[srcStep], yi = srcIm[srcStep];
+    if (kInverse) {
+        xi = -xi;
+        yi = -yi;
+    }
+    SumDifference(xr, xi, yr, yi);
+    const E scale = E(1) / E(2), negScale = -scale;
+    re[0] = kInverse ? xr * scale : xr;
+    im[0] = kInverse ? xi * negScale : xi;
+    re[step] = kInverse ? yr * scale : yr;
+    im[step] = kInverse ? yi * negScale : yi;
+}
+
+// The transform of plan.size points (2 or more) read from a distinct source
+// in form kSrc, worked on in re/im in form F and left as kOut says.
+template <class E, Form kSrc, Form F, Output kOut, bool kInverse>
+void TransformFrom(const FFTPlan<E>& plan, const E* srcRe, const E* srcIm, E* re, E* im, E* outRe, E* outIm)
+{
+    const StageThreeFactors<E> factors(plan);
+    const E scale = E(1) / static_cast<E>(plan.size);
+    if ((plan.order & 1u) == 0) {
+        GatherFirstStages<E, kSrc, F, kInverse, 4>(plan.order, srcRe, srcIm, re, im, factors.w);
+        RemainingStages<E, F, kOut, kInverse>(plan, 3, re, im, outRe, outIm, scale);
     } else {
-        const E* tw = plan.twiddles;
-        const std::size_t stride = std::size_t(1) << (order - 3);
-        const E w[8] = {tw[0], tw[1], tw[2 * stride], tw[2 * stride + 1],
-                        tw[4 * stride], tw[4 * stride + 1], tw[6 * stride], tw[6 * stride + 1]};
-        StagesOneToThree<E, kPairs>(n / 8, re, im, w);
-        s = 4;
-    }
-    for (; s + 1 <= order; s += 2) StagePair<E, kPairs>(plan, s, re, im);
-}
-
-template <class E, bool kPairs>
-[[gnu::noinline]] void NegateImaginary(std::size_t n, E* __restrict re, E* __restrict im)
-{
-    using L = Layout<kPairs>;
-    for (std::size_t i = 0; i < n; ++i) L::Im(re, im, i) = -L::Im(re, im, i);
-}
-
-// re times scale, im times -scale: the second product undoes the
-// conjugation and scales in one step.
-template <class E, bool kPairs>
-[[gnu::noinline]] void ScaleConjugate(std::size_t n, E* __restrict re, E* __restrict im, E scale)
-{
-    using L = Layout<kPairs>;
-    const E negScale = -scale;
-    for (std::size_t i = 0; i < n; ++i) {
-        L::Re(re, im, i) = L::Re(re, im, i) * scale;
-        L::Im(re, im, i) = L::Im(re, im, i) * negScale;
+        GatherFirstStages<E, kSrc, F, kInverse, 8>(plan.order, srcRe, srcIm, re, im, factors.w);
+        RemainingStages<E, F, kOut, kInverse>(plan, 4, re, im, outRe, outIm, scale);
     }
 }
 
-// Pairs out to split arrays, each re times scale and im times -scale when
-// kScale is set: the last step of the inverse fused with the split.
-template <class E, bool kScale>
-[[gnu::noinline]] void PairsToSplit(std::size_t n, const E* __restrict pairs, E* __restrict re, E* __restrict im,
-                                    E scale)
-{
-    const E negScale = -scale;
-    for (std::size_t i = 0; i < n; ++i) {
-        re[i] = kScale ? pairs[2 * i] * scale : pairs[2 * i];
-        im[i] = kScale ? pairs[2 * i + 1] * negScale : pairs[2 * i + 1];
-    }
-}
-
-// The transform of `size` points in place; kPairs selects the layout.
-template <class E, bool kPairs>
-void ForwardInPlace(const FFTPlan<E>& plan, E* re, E* im)
-{
-    if (plan.size == 1) return;
-    SwapByTable<E, kPairs>(plan.size, plan.swapTable, re, im);
-    Stages<E, kPairs>(plan, re, im);
-}
-
-template <class E, bool kPairs>
-void InverseInPlace(const FFTPlan<E>& plan, E* re, E* im)
+// Interleaved pairs in place: the swap-table exchanges, then the same
+// stages, the first pass turning each group into the blocked form.
+template <class E, bool kInverse>
+void PairsInPlace(const FFTPlan<E>& plan, E* pairs)
 {
     const std::size_t n = plan.size;
     if (n == 1) return;
-    const E scale = E(1) / static_cast<E>(plan.size);
-    NegateImaginary<E, kPairs>(n, re, im);
-    ForwardInPlace<E, kPairs>(plan, re, im);
-    ScaleConjugate<E, kPairs>(n, re, im, scale);
-}
-
-// The same transforms from a source array into a distinct destination of
-// the same layout: the same bits as copying first and transforming in place.
-template <class E, bool kPairs>
-void ForwardInto(const FFTPlan<E>& plan, const E* srcRe, const E* srcIm, E* re, E* im)
-{
-    if (plan.size == 1) {
-        Layout<kPairs>::Re(re, im, 0) = Layout<kPairs>::Re(srcRe, srcIm, 0);
-        Layout<kPairs>::Im(re, im, 0) = Layout<kPairs>::Im(srcRe, srcIm, 0);
+    if (n == 2) {
+        TwoPoints<E, kInverse>(pairs, pairs + 1, 2, pairs, pairs + 1, 2);
         return;
     }
-    PermuteInto<E, kPairs, kPairs, false>(plan.size, plan.order, plan.swapTable, srcRe, srcIm, re, im);
-    Stages<E, kPairs>(plan, re, im);
+    SwapByTable(n, plan.swapTable, pairs);
+    const StageThreeFactors<E> factors(plan);
+    const E scale = E(1) / static_cast<E>(n);
+    if ((plan.order & 1u) == 0) {
+        FirstStagesInPlace<E, kInverse, 4>(n / 4, pairs, factors.w);
+        RemainingStages<E, Form::kBlocked, Output::kPairsInPlace, kInverse>(plan, 3, pairs, pairs, nullptr, nullptr,
+                                                                            scale);
+    } else {
+        FirstStagesInPlace<E, kInverse, 8>(n / 8, pairs, factors.w);
+        RemainingStages<E, Form::kBlocked, Output::kPairsInPlace, kInverse>(plan, 4, pairs, pairs, nullptr, nullptr,
+                                                                            scale);
+    }
 }
 
-template <class E, bool kPairs>
-void InverseInto(const FFTPlan<E>& plan, const E* srcRe, const E* srcIm, E* re, E* im)
+// Interleaved pairs from a distinct source into dst, which is also the
+// work array: the same bits as copying first and transforming in place.
+template <class E, bool kInverse>
+void PairsInto(const FFTPlan<E>& plan, const E* src, E* dst)
 {
     const std::size_t n = plan.size;
     if (n == 1) {
-        ForwardInto<E, kPairs>(plan, srcRe, srcIm, re, im);
+        dst[0] = src[0];
+        dst[1] = src[1];
         return;
     }
-    const E scale = E(1) / static_cast<E>(plan.size);
-    PermuteInto<E, kPairs, kPairs, true>(n, plan.order, plan.swapTable, srcRe, srcIm, re, im);
-    Stages<E, kPairs>(plan, re, im);
-    ScaleConjugate<E, kPairs>(n, re, im, scale);
+    if (n == 2) {
+        TwoPoints<E, kInverse>(src, src + 1, 2, dst, dst + 1, 2);
+        return;
+    }
+    TransformFrom<E, Form::kPairs, Form::kBlocked, Output::kPairsInPlace, kInverse>(plan, src, src + 1, dst, dst,
+                                                                                   nullptr, nullptr);
 }
 
-// Split arrays through a work array of pairs (2 * size elements): the
-// source is permuted into pairs, transformed there and split out into the
-// destination. The same bits as the transforms on pairs; the work array
-// keeps the real and imaginary streams apart from the caller's arrays,
-// which often lie a multiple of 4 KiB apart and would make loads wait on
-// unrelated stores.
-template <class E>
-void SplitForwardVia(const FFTPlan<E>& plan, const E* srcRe, const E* srcIm, E* work, E* re, E* im)
+// Split arrays through a work array of 2 * size elements in the blocked
+// form; the last stages write the destination arrays. The work array keeps
+// the stages away from the caller's arrays, which often lie a multiple of
+// 4 KiB apart and would make loads wait on unrelated stores.
+template <class E, bool kInverse>
+void SplitVia(const FFTPlan<E>& plan, const E* srcRe, const E* srcIm, E* work, E* re, E* im)
 {
-    if (plan.size == 1) {
+    const std::size_t n = plan.size;
+    if (n == 1) {
         re[0] = srcRe[0];
         im[0] = srcIm[0];
         return;
     }
-    PermuteInto<E, false, true, false>(plan.size, plan.order, plan.swapTable, srcRe, srcIm, work, work + 1);
-    Stages<E, true>(plan, work, work + 1);
-    PairsToSplit<E, false>(plan.size, work, re, im, E(1));
-}
-
-template <class E>
-void SplitInverseVia(const FFTPlan<E>& plan, const E* srcRe, const E* srcIm, E* work, E* re, E* im)
-{
-    if (plan.size == 1) {
-        re[0] = srcRe[0];
-        im[0] = srcIm[0];
+    if (n == 2) {
+        TwoPoints<E, kInverse>(srcRe, srcIm, 1, re, im, 1);
         return;
     }
-    const E scale = E(1) / static_cast<E>(plan.size);
-    PermuteInto<E, false, true, true>(plan.size, plan.order, plan.swapTable, srcRe, srcIm, work, work + 1);
-    Stages<E, true>(plan, work, work + 1);
-    PairsToSplit<E, true>(plan.size, work, re, im, scale);
+    TransformFrom<E, Form::kSplit, Form::kBlocked, Output::kSplitArrays, kInverse>(plan, srcRe, srcIm, work, work,
+                                                                                  re, im);
 }
 
-// Interleaved (re, im) pairs, size of them, in place.
+// The forward transform of pairs from a distinct source into split arrays,
+// which are also the work arrays (the real transform's half).
+template <class E>
+void PairsToSplitForward(const FFTPlan<E>& plan, const E* src, E* re, E* im)
+{
+    if (plan.size == 1) {
+        re[0] = src[0];
+        im[0] = src[1];
+        return;
+    }
+    if (plan.size == 2) {
+        TwoPoints<E, false>(src, src + 1, 2, re, im, 1);
+        return;
+    }
+    TransformFrom<E, Form::kPairs, Form::kSplit, Output::kInPlace, false>(plan, src, src + 1, re, im, nullptr, nullptr);
+}
+
 template <class E>
 void ComplexFFTForward(const FFTPlan<E>& plan, E* pairs)
 {
-    ForwardInPlace<E, true>(plan, pairs, pairs + 1);
+    PairsInPlace<E, false>(plan, pairs);
 }
 
 template <class E>
 void ComplexFFTInverse(const FFTPlan<E>& plan, E* pairs)
 {
-    InverseInPlace<E, true>(plan, pairs, pairs + 1);
+    PairsInPlace<E, true>(plan, pairs);
 }
 
 }  // namespace cpp

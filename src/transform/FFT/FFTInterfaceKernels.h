@@ -91,9 +91,9 @@ void ComplexInterleaved(const std::complex<E>* src, std::complex<E>* dst, const 
     const unsigned int count = 2 * state->size;
     if (!Overlap(from, to, count)) {
         if (inverse) {
-            InverseInto<E, true>(plan, from, from + 1, to, to + 1);
+            PairsInto<E, true>(plan, from, to);
         } else {
-            ForwardInto<E, true>(plan, from, from + 1, to, to + 1);
+            PairsInto<E, false>(plan, from, to);
         }
         return;
     }
@@ -107,10 +107,10 @@ void ComplexInterleaved(const std::complex<E>* src, std::complex<E>* dst, const 
 
 // Deinterleaved complex: the result is that of staging the input in the
 // destinations (which makes srcReal == dstReal and srcImag == dstImag
-// work), pairing it up in the plan's interleave scratch, transforming the
-// pairs and splitting them back. The pairing is fused with the permutation
-// and the split with the inverse's scaling; the staging copies are needed
-// only when a source overlaps a destination.
+// work) and transforming it there. The stages run in the plan's interleave
+// scratch, between the permutation that reads the source and the last
+// stages that write the destinations; the staging copies are needed only
+// when a source overlaps a destination.
 template <class State, class E>
 void ComplexDeinterleaved(const E* srcReal, const E* srcImag, E* dstReal, E* dstImag, State* state, bool inverse)
 {
@@ -125,11 +125,11 @@ void ComplexDeinterleaved(const E* srcReal, const E* srcImag, E* dstReal, E* dst
         srcImag = dstImag;
     }
     plan.interleaveScratch.Resize(2 * n);
-    E* pairs = plan.interleaveScratch.data();
+    E* work = plan.interleaveScratch.data();
     if (inverse) {
-        SplitInverseVia(plan, srcReal, srcImag, pairs, dstReal, dstImag);
+        SplitVia<E, true>(plan, srcReal, srcImag, work, dstReal, dstImag);
     } else {
-        SplitForwardVia(plan, srcReal, srcImag, pairs, dstReal, dstImag);
+        SplitVia<E, false>(plan, srcReal, srcImag, work, dstReal, dstImag);
     }
 }
 

@@ -86,8 +86,7 @@ void RealFFTForward(FFTPlan<E>& plan, const E* src, E* dst)
     E* zr = plan.forwardScratch.data();
     E* zi = zr + h + (h >= 16 ? 16 : 0);
     const FFTPlan<E>& half = *plan.halfPlan;
-    PermuteInto<E, true, false, false>(h, half.order, half.swapTable, src, src + 1, zr, zi);
-    Stages<E, false>(half, zr, zi);
+    PairsToSplitForward(half, src, zr, zi);
 
     const E* w = plan.twiddles;
     CombineLower(h, zr, zi, w, dst);

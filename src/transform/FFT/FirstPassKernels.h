@@ -1,0 +1,149 @@
+#pragma once
+
+// The bit-reversal permutation, fused with the first two or three stages,
+// which need no table factors beyond four constants. The pass leaves the
+// points in a working form (split or blocked) for the stages that follow.
+
+#include <cstddef>
+#include <cstdint>
+
+#include "transform/FFT/Butterflies.h"
+
+namespace kestaccel {
+namespace transform {
+namespace cpp {
+
+// The exchanges of the swap table on pairs, in place, walked upwards. An
+// entry equal to its index exchanges the point with itself, which changes
+// nothing; doing so unconditionally saves a branch that mispredicts half
+// the time.
+template <class E>
+[[gnu::noinline]] void SwapByTable(std::size_t n, const std::uint32_t* __restrict table, E* __restrict pairs)
+{
+    for (std::size_t i = 0; i + 1 < n; ++i) {
+        const std::size_t p = table[i];
+        const E r = pairs[2 * i], m = pairs[2 * i + 1];
+        pairs[2 * i] = pairs[2 * p];
+        pairs[2 * i + 1] = pairs[2 * p + 1];
+        pairs[2 * p] = r;
+        pairs[2 * p + 1] = m;
+    }
+}
+
+// Each byte with its bits reversed.
+struct ReversedBytes {
+    std::uint8_t value[256];
+};
+
+constexpr ReversedBytes MakeReversedBytes()
+{
+    ReversedBytes table{};
+    for (unsigned int b = 0; b < 256; ++b) {
+        unsigned int r = 0;
+        for (unsigned int bit = 0; bit < 8; ++bit) r |= ((b >> bit) & 1u) << (7 - bit);
+        table.value[b] = static_cast<std::uint8_t>(r);
+    }
+    return table;
+}
+
+inline constexpr ReversedBytes kReversedBytes = MakeReversedBytes();
+
+// The low `bits` bits of x in reverse order (bits up to 32).
+inline std::size_t ReverseBits(std::size_t x, unsigned int bits)
+{
+    const std::uint32_t v = static_cast<std::uint32_t>(x);
+    const std::uint32_t r = (std::uint32_t(kReversedBytes.value[v & 0xffu]) << 24) |
+                            (std::uint32_t(kReversedBytes.value[(v >> 8) & 0xffu]) << 16) |
+                            (std::uint32_t(kReversedBytes.value[(v >> 16) & 0xffu]) << 8) |
+                            std::uint32_t(kReversedBytes.value[v >> 24]);
+    return bits == 0 ? 0 : r >> (32 - bits);
+}
+
+// Groups of 4 points take stages 1 and 2, groups of 8 stages 1 to 3 (with
+// the factors w), so that an even number of stages remains for the pairs.
+template <class E, std::size_t kGroup>
+inline void FirstStages(E* r, E* m, const E* w)
+{
+    if constexpr (kGroup == 4) {
+        StagesOneTwo(r, m);
+    } else {
+        StagesOneToThree(r, m, w);
+    }
+}
+
+// Point t of a group in bit-reversed order sits reverse(t) quarters or
+// eighths of the transform away from the group's first point.
+template <std::size_t kGroup>
+constexpr std::size_t ReversedPosition(std::size_t t)
+{
+    return kReversedBytes.value[t] >> (kGroup == 4 ? 6 : 5);
+}
+
+// The permuted copy from a distinct source: group g of the destination
+// (points kGroup g onwards) gathers the points whose indices are the
+// bit-reversed ones, takes the first stages and is stored. This gives the
+// same points as the swap-table exchanges followed by those stages. The
+// group index is walked with its low bits outside and its top kInnerBits
+// inside: the source indices then run over blocks of consecutive points,
+// and the groups written come back to the same cache lines soon, which
+// keeps large transforms in cache. kConjugate negates the imaginary parts
+// on the way, as the inverse needs.
+constexpr unsigned int kInnerBits = 5;
+
+template <class E, Form kSrc, Form kDst, bool kConjugate, std::size_t kGroup>
+[[gnu::noinline]] void GatherFirstStages(std::uint32_t order, const E* __restrict srcRe, const E* __restrict srcIm,
+                                         E* __restrict dstRe, E* __restrict dstIm, const E* __restrict w)
+{
+    using S = Points<E, kSrc>;
+    using D = Points<E, kDst>;
+    constexpr unsigned int groupBits = kGroup == 4 ? 2 : 3;
+    constexpr std::size_t lanes = kDst == Form::kBlocked ? kLanes<E> : kGroup;
+    const unsigned int bits = order - groupBits;
+    const unsigned int innerBits = bits < kInnerBits ? bits : kInnerBits;
+    const unsigned int outerBits = bits - innerBits;
+    const std::size_t quarter = std::size_t(1) << bits;  // n / kGroup
+    for (std::size_t c = 0; c < (std::size_t(1) << outerBits); ++c) {
+        const std::size_t low = ReverseBits(c, outerBits) << innerBits;
+        for (std::size_t a = 0; a < (std::size_t(1) << innerBits); ++a) {
+            const std::size_t first = low | (std::size_t(kReversedBytes.value[a]) >> (8 - innerBits));
+            const std::size_t g = (a << outerBits) | c;
+            E r[kGroup], m[kGroup];
+            for (std::size_t t = 0; t < kGroup; ++t) {
+                const std::size_t p = first + ReversedPosition<kGroup>(t) * quarter;
+                r[t] = S::Re(srcRe, srcIm, p, 0);
+                m[t] = kConjugate ? -S::Im(srcRe, srcIm, p, 0) : S::Im(srcRe, srcIm, p, 0);
+            }
+            FirstStages<E, kGroup>(r, m, w);
+            for (std::size_t t = 0; t < kGroup; ++t) {
+                D::Re(dstRe, dstIm, kGroup * g + t - t % lanes, t % lanes) = r[t];
+                D::Im(dstRe, dstIm, kGroup * g + t - t % lanes, t % lanes) = m[t];
+            }
+        }
+    }
+}
+
+// The same stages on pairs already exchanged in place, each group rewritten
+// in the blocked form over its own bytes.
+template <class E, bool kConjugate, std::size_t kGroup>
+[[gnu::noinline]] void FirstStagesInPlace(std::size_t groups, E* __restrict data, const E* __restrict w)
+{
+    using D = Points<E, Form::kBlocked>;
+    constexpr std::size_t lanes = kLanes<E>;
+    for (std::size_t g = 0; g < groups; ++g) {
+        E* group = data + 2 * kGroup * g;
+        E r[kGroup], m[kGroup];
+        for (std::size_t t = 0; t < kGroup; ++t) {
+            r[t] = group[2 * t];
+            m[t] = kConjugate ? -group[2 * t + 1] : group[2 * t + 1];
+        }
+        FirstStages<E, kGroup>(r, m, w);
+        for (std::size_t t = 0; t < kGroup; ++t) {
+            D::Re(group, group, t - t % lanes, t % lanes) = r[t];
+            D::Im(group, group, t - t % lanes, t % lanes) = m[t];
+        }
+    }
+}
+
+}  // namespace cpp
+}  // namespace transform
+}  // namespace kestaccel
