@@ -41,79 +41,37 @@ struct FactorChunk {
     E re[kChunk];
     E im[kChunk];
 
-    // Pairs first, first + 1, ... of the table at the given stride.
+    // Pairs first, first + 1, ... of the table at the given stride. The
+    // strides of the last stages, 1 and 2, are spelled out: as constants
+    // they give g++ a plain deinterleaving loop.
     void Gather(const E* tw, std::size_t first, std::size_t count, std::size_t stride)
     {
+        if (stride == 1) {
+            GatherAt<1>(tw + 2 * first, count, 1);
+        } else if (stride == 2) {
+            GatherAt<2>(tw + 4 * first, count, 2);
+        } else {
+            GatherAt<0>(tw + 2 * first * stride, count, stride);
+        }
+    }
+
+    template <std::size_t kStride>
+    void GatherAt(const E* from, std::size_t count, std::size_t stride)
+    {
+        const std::size_t step = kStride != 0 ? kStride : stride;
         for (std::size_t t = 0; t < count; ++t) {
-            re[t] = tw[2 * (first + t) * stride];
-            im[t] = tw[2 * (first + t) * stride + 1];
+            re[t] = from[2 * t * step];
+            im[t] = from[2 * t * step + 1];
         }
     }
 };
 
-// Two consecutive stages s and s + 1 over blocks of 4q points, q the half
-// span of stage s. Points j, j + q, j + 2q, j + 3q: stage s pairs the first
-// two and the last two with factor a[j]; stage s + 1 then pairs j with
-// j + 2q (factor b[j]) and j + q with j + 3q (factor c[j]). The four
-// streams start at r0 .. r3 (and i0 .. i3 in the split form).
-template <class E, Form F>
-[[gnu::noinline]] void StagePairRun(std::size_t blocks, std::size_t span, std::size_t count, E* __restrict r0,
-                                    E* __restrict i0, E* __restrict r1, E* __restrict i1, E* __restrict r2,
-                                    E* __restrict i2, E* __restrict r3, E* __restrict i3, const E* __restrict ar_,
-                                    const E* __restrict ai_, const E* __restrict br_, const E* __restrict bi_,
-                                    const E* __restrict cr_, const E* __restrict ci_)
-{
-    using P = Points<E, F>;
-    constexpr std::size_t lanes = kLanes<E>;
-    for (std::size_t b = 0; b < blocks; ++b) {
-        const std::size_t o = b * span;
-        for (std::size_t j = 0; j < count; j += lanes) {
-            for (std::size_t t = 0; t < lanes; ++t) {
-                const std::size_t k = o + j;
-                E ar = P::Re(r0, i0, k, t), ai = P::Im(r0, i0, k, t), br = P::Re(r1, i1, k, t), bi = P::Im(r1, i1, k, t);
-                E cr = P::Re(r2, i2, k, t), ci = P::Im(r2, i2, k, t), dr = P::Re(r3, i3, k, t), di = P::Im(r3, i3, k, t);
-                Butterfly(ar, ai, br, bi, ar_[j + t], ai_[j + t]);
-                Butterfly(cr, ci, dr, di, ar_[j + t], ai_[j + t]);
-                Butterfly(ar, ai, cr, ci, br_[j + t], bi_[j + t]);
-                Butterfly(br, bi, dr, di, cr_[j + t], ci_[j + t]);
-                P::Re(r0, i0, k, t) = ar;
-                P::Im(r0, i0, k, t) = ai;
-                P::Re(r1, i1, k, t) = br;
-                P::Im(r1, i1, k, t) = bi;
-                P::Re(r2, i2, k, t) = cr;
-                P::Im(r2, i2, k, t) = ci;
-                P::Re(r3, i3, k, t) = dr;
-                P::Im(r3, i3, k, t) = di;
-            }
-        }
-    }
-}
-
-template <class E, Form F>
-void StagePair(const FFTPlan<E>& plan, std::uint32_t s, E* re, E* im)
-{
-    using P = Points<E, F>;
-    const std::size_t n = plan.size;
-    const std::size_t q = std::size_t(1) << (s - 1);
-    const std::size_t strideB = std::size_t(1) << (plan.order - s - 1);
-    FactorChunk<E> a, b, c;
-    for (std::size_t j0 = 0; j0 < q; j0 += kChunk) {
-        const std::size_t count = q - j0 < kChunk ? q - j0 : kChunk;
-        a.Gather(plan.twiddles, j0, count, 2 * strideB);
-        b.Gather(plan.twiddles, j0, count, strideB);
-        c.Gather(plan.twiddles, j0 + q, count, strideB);
-        const std::size_t o0 = P::Offset(j0), o1 = P::Offset(j0 + q), o2 = P::Offset(j0 + 2 * q),
-                          o3 = P::Offset(j0 + 3 * q);
-        StagePairRun<E, F>(n / (4 * q), 4 * q, count, re + o0, im + o0, re + o1, im + o1, re + o2, im + o2, re + o3,
-                           im + o3, a.re, a.im, b.re, b.im, c.re, c.im);
-    }
-}
-
-// Where the last stages leave the result: over the working array in its
+// Where a pair of stages leaves its result: over the working array in its
 // own form; over it as interleaved pairs (a block covers the same bytes as
-// its points in pairs); or in separate split arrays. With kScale the real
-// parts are multiplied by scale and the imaginary parts by -scale, which
-// undoes the inverse's conjugation and divides by N in one step.
+// its points in pairs); or in separate split arrays. Only the last pair
+// writes anything but kInPlace. With kScale the real parts are multiplied
+// by scale and the imaginary parts by -scale, which undoes the inverse's
+// conjugation and divides by N in one step.
 enum class Output { kInPlace, kPairsInPlace, kSplitArrays };
 
 template <class E, Form F, Output kOut, bool kScale>
@@ -140,42 +98,76 @@ struct Writer {
     }
 };
 
-// The last two stages: a single block of 4q = N points, whose factors are
-// the table itself at strides 2 and 1, read in place instead of gathered.
-// Each block of points is read whole before anything is written, since
-// the pair output rewrites the bytes of the block in another order.
+// Two consecutive stages s and s + 1 over blocks of 4q points, q the half
+// span of stage s. Points j, j + q, j + 2q, j + 3q: stage s pairs the first
+// two and the last two with factor a[j]; stage s + 1 then pairs j with
+// j + 2q (factor b[j]) and j + q with j + 3q (factor c[j]). The four
+// streams start at r0 .. r3 (and i0 .. i3 in the split form), their split
+// outputs, if any, at o0r/o0i .. o3r/o3i. Each block of kLanes points is
+// read whole before anything is written, since the pair output rewrites
+// the bytes of the block in another order.
 template <class E, Form F, Output kOut, bool kScale>
-[[gnu::noinline]] void LastStagePairRun(std::size_t q, E* __restrict r0, E* __restrict i0, E* __restrict r1,
-                                        E* __restrict i1, E* __restrict r2, E* __restrict i2, E* __restrict r3,
-                                        E* __restrict i3, const E* __restrict tw, const E* __restrict twUpper,
-                                        E* __restrict o0r, E* __restrict o0i, E* __restrict o1r, E* __restrict o1i,
-                                        E* __restrict o2r, E* __restrict o2i, E* __restrict o3r, E* __restrict o3i,
-                                        E scale)
+[[gnu::noinline]] void StagePairRun(std::size_t blocks, std::size_t span, std::size_t count, E* __restrict r0,
+                                    E* __restrict i0, E* __restrict r1, E* __restrict i1, E* __restrict r2,
+                                    E* __restrict i2, E* __restrict r3, E* __restrict i3, const E* __restrict ar_,
+                                    const E* __restrict ai_, const E* __restrict br_, const E* __restrict bi_,
+                                    const E* __restrict cr_, const E* __restrict ci_, E* __restrict o0r,
+                                    E* __restrict o0i, E* __restrict o1r, E* __restrict o1i, E* __restrict o2r,
+                                    E* __restrict o2i, E* __restrict o3r, E* __restrict o3i, E scale)
 {
     using P = Points<E, F>;
     constexpr std::size_t lanes = kLanes<E>;
     const Writer<E, F, kOut, kScale> out{scale, -scale};
-    for (std::size_t j = 0; j < q; j += lanes) {
-        E ar[lanes], ai[lanes], br[lanes], bi[lanes], cr[lanes], ci[lanes], dr[lanes], di[lanes];
-        for (std::size_t t = 0; t < lanes; ++t) {
-            ar[t] = P::Re(r0, i0, j, t), ai[t] = P::Im(r0, i0, j, t), br[t] = P::Re(r1, i1, j, t);
-            bi[t] = P::Im(r1, i1, j, t), cr[t] = P::Re(r2, i2, j, t), ci[t] = P::Im(r2, i2, j, t);
-            dr[t] = P::Re(r3, i3, j, t), di[t] = P::Im(r3, i3, j, t);
+    for (std::size_t b = 0; b < blocks; ++b) {
+        const std::size_t o = b * span;
+        for (std::size_t j = 0; j < count; j += lanes) {
+            const std::size_t k = o + j;
+            E ar[lanes], ai[lanes], br[lanes], bi[lanes], cr[lanes], ci[lanes], dr[lanes], di[lanes];
+            for (std::size_t t = 0; t < lanes; ++t) {
+                ar[t] = P::Re(r0, i0, k, t), ai[t] = P::Im(r0, i0, k, t), br[t] = P::Re(r1, i1, k, t);
+                bi[t] = P::Im(r1, i1, k, t), cr[t] = P::Re(r2, i2, k, t), ci[t] = P::Im(r2, i2, k, t);
+                dr[t] = P::Re(r3, i3, k, t), di[t] = P::Im(r3, i3, k, t);
+            }
+            for (std::size_t t = 0; t < lanes; ++t) {
+                const std::size_t u = j + t;
+                Butterfly(ar[t], ai[t], br[t], bi[t], ar_[u], ai_[u]);
+                Butterfly(cr[t], ci[t], dr[t], di[t], ar_[u], ai_[u]);
+                Butterfly(ar[t], ai[t], cr[t], ci[t], br_[u], bi_[u]);
+                Butterfly(br[t], bi[t], dr[t], di[t], cr_[u], ci_[u]);
+            }
+            for (std::size_t t = 0; t < lanes; ++t) {
+                out.Put(r0, i0, o0r, o0i, k, t, ar[t], ai[t]);
+                out.Put(r1, i1, o1r, o1i, k, t, br[t], bi[t]);
+                out.Put(r2, i2, o2r, o2i, k, t, cr[t], ci[t]);
+                out.Put(r3, i3, o3r, o3i, k, t, dr[t], di[t]);
+            }
         }
-        for (std::size_t t = 0; t < lanes; ++t) {
-            const std::size_t u = j + t;
-            const E war = tw[4 * u], wai = tw[4 * u + 1];
-            Butterfly(ar[t], ai[t], br[t], bi[t], war, wai);
-            Butterfly(cr[t], ci[t], dr[t], di[t], war, wai);
-            Butterfly(ar[t], ai[t], cr[t], ci[t], tw[2 * u], tw[2 * u + 1]);
-            Butterfly(br[t], bi[t], dr[t], di[t], twUpper[2 * u], twUpper[2 * u + 1]);
-        }
-        for (std::size_t t = 0; t < lanes; ++t) {
-            out.Put(r0, i0, o0r, o0i, j, t, ar[t], ai[t]);
-            out.Put(r1, i1, o1r, o1i, j, t, br[t], bi[t]);
-            out.Put(r2, i2, o2r, o2i, j, t, cr[t], ci[t]);
-            out.Put(r3, i3, o3r, o3i, j, t, dr[t], di[t]);
-        }
+    }
+}
+
+// Stages s and s + 1; the last pair (s + 1 = order) writes the output.
+template <class E, Form F, Output kOut, bool kScale>
+void StagePair(const FFTPlan<E>& plan, std::uint32_t s, E* re, E* im, E* outRe, E* outIm, E scale)
+{
+    using P = Points<E, F>;
+    const std::size_t n = plan.size;
+    const std::size_t q = std::size_t(1) << (s - 1);
+    const std::size_t strideB = std::size_t(1) << (plan.order - s - 1);
+    // Output streams exist only for split arrays; null pointers stay unused.
+    const auto at = [](E* p, std::size_t k) { return p == nullptr ? p : p + k; };
+    FactorChunk<E> a, b, c;
+    for (std::size_t j0 = 0; j0 < q; j0 += kChunk) {
+        const std::size_t count = q - j0 < kChunk ? q - j0 : kChunk;
+        a.Gather(plan.twiddles, j0, count, 2 * strideB);
+        b.Gather(plan.twiddles, j0, count, strideB);
+        c.Gather(plan.twiddles, j0 + q, count, strideB);
+        const std::size_t o0 = P::Offset(j0), o1 = P::Offset(j0 + q), o2 = P::Offset(j0 + 2 * q),
+                          o3 = P::Offset(j0 + 3 * q);
+        StagePairRun<E, F, kOut, kScale>(n / (4 * q), 4 * q, count, re + o0, im + o0, re + o1, im + o1, re + o2,
+                                         im + o2, re + o3, im + o3, a.re, a.im, b.re, b.im, c.re, c.im,
+                                         at(outRe, j0), at(outIm, j0), at(outRe, j0 + q), at(outIm, j0 + q),
+                                         at(outRe, j0 + 2 * q), at(outIm, j0 + 2 * q), at(outRe, j0 + 3 * q),
+                                         at(outIm, j0 + 3 * q), scale);
     }
 }
 
@@ -203,21 +195,12 @@ template <class E, Form F, Output kOut, bool kScale>
 template <class E, Form F, Output kOut, bool kScale>
 void RemainingStages(const FFTPlan<E>& plan, std::uint32_t s, E* re, E* im, E* outRe, E* outIm, E scale)
 {
-    using P = Points<E, F>;
-    const std::size_t n = plan.size;
     if (s > plan.order) {
-        if (kOut != Output::kInPlace || kScale) WriteOut<E, F, kOut, kScale>(n, re, im, outRe, outIm, scale);
+        if (kOut != Output::kInPlace || kScale) WriteOut<E, F, kOut, kScale>(plan.size, re, im, outRe, outIm, scale);
         return;
     }
-    for (; s + 1 < plan.order; s += 2) StagePair<E, F>(plan, s, re, im);
-    const std::size_t q = n / 4;
-    const std::size_t o1 = P::Offset(q), o2 = P::Offset(2 * q), o3 = P::Offset(3 * q);
-    // Output streams exist only for split arrays; null pointers stay unused.
-    const auto at = [](E* p, std::size_t k) { return p == nullptr ? p : p + k; };
-    LastStagePairRun<E, F, kOut, kScale>(q, re, im, re + o1, im + o1, re + o2, im + o2, re + o3, im + o3,
-                                         plan.twiddles, plan.twiddles + 2 * q, outRe, outIm, at(outRe, q),
-                                         at(outIm, q), at(outRe, 2 * q), at(outIm, 2 * q), at(outRe, 3 * q),
-                                         at(outIm, 3 * q), scale);
+    for (; s + 1 < plan.order; s += 2) StagePair<E, F, Output::kInPlace, false>(plan, s, re, im, nullptr, nullptr, scale);
+    StagePair<E, F, kOut, kScale>(plan, s, re, im, outRe, outIm, scale);
 }
 
 // The four stage-3 factors of a plan (at an eighth of its table apart), for
@@ -263,10 +246,10 @@ void TransformFrom(const FFTPlan<E>& plan, const E* srcRe, const E* srcIm, E* re
     const StageThreeFactors<E> factors(plan);
     const E scale = E(1) / static_cast<E>(plan.size);
     if ((plan.order & 1u) == 0) {
-        GatherFirstStages<E, kSrc, F, kInverse, 4>(plan.order, srcRe, srcIm, re, im, factors.w);
+        FirstPass<E, kSrc, F, kInverse, 4>(plan.order, srcRe, srcIm, re, im, factors.w);
         RemainingStages<E, F, kOut, kInverse>(plan, 3, re, im, outRe, outIm, scale);
     } else {
-        GatherFirstStages<E, kSrc, F, kInverse, 8>(plan.order, srcRe, srcIm, re, im, factors.w);
+        FirstPass<E, kSrc, F, kInverse, 8>(plan.order, srcRe, srcIm, re, im, factors.w);
         RemainingStages<E, F, kOut, kInverse>(plan, 4, re, im, outRe, outIm, scale);
     }
 }

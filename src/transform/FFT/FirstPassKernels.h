@@ -122,6 +122,70 @@ template <class E, Form kSrc, Form kDst, bool kConjugate, std::size_t kGroup>
     }
 }
 
+// The same pass with the loops turned around, for orders with at least four
+// groups: runs of kRun consecutive source positions are read together, so
+// the loads are contiguous and the first stages run on vectors across the
+// run; the kRun groups of a run lie spread through the destination
+// (bit-reversed run positions apart), each stored whole.
+constexpr std::size_t kRun = 4;
+
+template <class E, Form kSrc, Form kDst, bool kConjugate, std::size_t kGroup>
+[[gnu::noinline]] void GatherFirstStagesByRuns(std::uint32_t order, const E* __restrict srcRe,
+                                               const E* __restrict srcIm, E* __restrict dstRe, E* __restrict dstIm,
+                                               const E* __restrict w)
+{
+    using S = Points<E, kSrc>;
+    using D = Points<E, kDst>;
+    constexpr unsigned int groupBits = kGroup == 4 ? 2 : 3;
+    constexpr std::size_t lanes = kDst == Form::kBlocked ? kLanes<E> : kGroup;
+    const unsigned int bits = order - groupBits;
+    const std::size_t quarter = std::size_t(1) << bits;  // n / kGroup
+    const std::size_t spread = quarter / kRun;
+    for (std::size_t r0 = 0; r0 < quarter; r0 += kRun) {
+        const std::size_t g0 = ReverseBits(r0, bits);
+        E re[kGroup][kRun], im[kGroup][kRun];
+        for (std::size_t t = 0; t < kGroup; ++t) {
+            for (std::size_t l = 0; l < kRun; ++l) {
+                const std::size_t p = r0 + l + ReversedPosition<kGroup>(t) * quarter;
+                re[t][l] = S::Re(srcRe, srcIm, p, 0);
+                im[t][l] = kConjugate ? -S::Im(srcRe, srcIm, p, 0) : S::Im(srcRe, srcIm, p, 0);
+            }
+        }
+#pragma GCC unroll 1
+        for (std::size_t l = 0; l < kRun; ++l) {
+            E r[kGroup], m[kGroup];
+            for (std::size_t t = 0; t < kGroup; ++t) {
+                r[t] = re[t][l];
+                m[t] = im[t][l];
+            }
+            FirstStages<E, kGroup>(r, m, w);
+            for (std::size_t t = 0; t < kGroup; ++t) {
+                re[t][l] = r[t];
+                im[t][l] = m[t];
+            }
+        }
+        for (std::size_t l = 0; l < kRun; ++l) {
+            const std::size_t g = g0 + (std::size_t(kReversedBytes.value[l]) >> 6) * spread;
+            for (std::size_t t = 0; t < kGroup; ++t) {
+                D::Re(dstRe, dstIm, kGroup * g + t - t % lanes, t % lanes) = re[t][l];
+                D::Im(dstRe, dstIm, kGroup * g + t - t % lanes, t % lanes) = im[t][l];
+            }
+        }
+    }
+}
+
+// The permuted copy with the first stages, by runs where there are at least
+// kRun groups.
+template <class E, Form kSrc, Form kDst, bool kConjugate, std::size_t kGroup>
+void FirstPass(std::uint32_t order, const E* srcRe, const E* srcIm, E* dstRe, E* dstIm, const E* w)
+{
+    if ((std::size_t(1) << order) >= kRun * kGroup) {
+        GatherFirstStagesByRuns<E, kSrc, kDst, kConjugate, kGroup>(order, srcRe, srcIm, dstRe, dstIm, w);
+    } else {
+        GatherFirstStages<E, kSrc, kDst, kConjugate, kGroup>(order, srcRe, srcIm, dstRe, dstIm, w);
+    }
+}
+
 // The same stages on pairs already exchanged in place, each group rewritten
 // in the blocked form over its own bytes.
 template <class E, bool kConjugate, std::size_t kGroup>
