@@ -76,54 +76,48 @@ inline void FirstStages(E* r, E* m, const E* w)
 template <std::size_t kGroup>
 constexpr std::size_t ReversedPosition(std::size_t t)
 {
+    static_assert(kGroup == 4 || kGroup == 8, "groups of 4 or 8 points");
     return kReversedBytes.value[t] >> (kGroup == 4 ? 6 : 5);
 }
 
-// The permuted copy from a distinct source: group g of the destination
-// (points kGroup g onwards) gathers the points whose indices are the
-// bit-reversed ones, takes the first stages and is stored. This gives the
-// same points as the swap-table exchanges followed by those stages. The
-// group index is walked with its low bits outside and its top kInnerBits
-// inside: the source indices then run over blocks of consecutive points,
-// and the groups written come back to the same cache lines soon, which
-// keeps large transforms in cache. kConjugate negates the imaginary parts
-// on the way, as the inverse needs.
-constexpr unsigned int kInnerBits = 5;
-
-template <class E, Form kSrc, Form kDst, bool kConjugate, std::size_t kGroup>
-[[gnu::noinline]] void GatherFirstStages(std::uint32_t order, const E* __restrict srcRe, const E* __restrict srcIm,
-                                         E* __restrict dstRe, E* __restrict dstIm, const E* __restrict w)
+// Group g of the destination: points kGroup g onwards, in the destination's
+// form.
+template <class E, Form kDst, std::size_t kGroup>
+inline void StoreGroup(E* dstRe, E* dstIm, std::size_t g, const E* r, const E* m)
 {
-    using S = Points<E, kSrc>;
     using D = Points<E, kDst>;
-    constexpr unsigned int groupBits = kGroup == 4 ? 2 : 3;
     constexpr std::size_t lanes = kDst == Form::kBlocked ? kLanes<E> : kGroup;
-    const unsigned int bits = order - groupBits;
-    const unsigned int innerBits = bits < kInnerBits ? bits : kInnerBits;
-    const unsigned int outerBits = bits - innerBits;
-    const std::size_t quarter = std::size_t(1) << bits;  // n / kGroup
-    for (std::size_t c = 0; c < (std::size_t(1) << outerBits); ++c) {
-        const std::size_t low = ReverseBits(c, outerBits) << innerBits;
-        for (std::size_t a = 0; a < (std::size_t(1) << innerBits); ++a) {
-            const std::size_t first = low | (std::size_t(kReversedBytes.value[a]) >> (8 - innerBits));
-            const std::size_t g = (a << outerBits) | c;
-            E r[kGroup], m[kGroup];
-            for (std::size_t t = 0; t < kGroup; ++t) {
-                const std::size_t p = first + ReversedPosition<kGroup>(t) * quarter;
-                r[t] = S::Re(srcRe, srcIm, p, 0);
-                m[t] = kConjugate ? -S::Im(srcRe, srcIm, p, 0) : S::Im(srcRe, srcIm, p, 0);
-            }
-            FirstStages<E, kGroup>(r, m, w);
-            for (std::size_t t = 0; t < kGroup; ++t) {
-                D::Re(dstRe, dstIm, kGroup * g + t - t % lanes, t % lanes) = r[t];
-                D::Im(dstRe, dstIm, kGroup * g + t - t % lanes, t % lanes) = m[t];
-            }
-        }
+    for (std::size_t t = 0; t < kGroup; ++t) {
+        D::Re(dstRe, dstIm, kGroup * g + t - t % lanes, t % lanes) = r[t];
+        D::Im(dstRe, dstIm, kGroup * g + t - t % lanes, t % lanes) = m[t];
     }
 }
 
-// The same pass with the loops turned around, for orders with at least four
-// groups: runs of kRun consecutive source positions are read together, so
+// The permuted copy from a distinct source, for a transform of kGroup
+// points (orders 2 and 3): its one group gathers the points at the
+// bit-reversed positions and takes the first stages. kConjugate negates
+// the imaginary parts on the way, as the inverse needs.
+template <class E, Form kSrc, Form kDst, bool kConjugate, std::size_t kGroup>
+[[gnu::noinline]] void GatherOneGroup(const E* __restrict srcRe, const E* __restrict srcIm, E* __restrict dstRe,
+                                      E* __restrict dstIm, const E* __restrict w)
+{
+    using S = Points<E, kSrc>;
+    E r[kGroup], m[kGroup];
+    for (std::size_t t = 0; t < kGroup; ++t) {
+        const std::size_t p = ReversedPosition<kGroup>(t);
+        r[t] = S::Re(srcRe, srcIm, p, 0);
+        m[t] = kConjugate ? -S::Im(srcRe, srcIm, p, 0) : S::Im(srcRe, srcIm, p, 0);
+    }
+    FirstStages<E, kGroup>(r, m, w);
+    StoreGroup<E, kDst, kGroup>(dstRe, dstIm, 0, r, m);
+}
+
+// The permuted copy from a distinct source with the first stages, for
+// transforms of at least four groups: group g of the destination holds the
+// points at the bit-reversed positions of kGroup g onwards, which lie at
+// reverse(g) plus reversed quarters (or eighths) of the transform. This
+// gives the same points as the swap-table exchanges followed by those
+// stages. Runs of kRun consecutive source positions are read together, so
 // the loads are contiguous and the first stages run on vectors across the
 // run; the kRun groups of a run lie spread through the destination
 // (bit-reversed run positions apart), each stored whole.
@@ -135,9 +129,7 @@ template <class E, Form kSrc, Form kDst, bool kConjugate, std::size_t kGroup>
                                                const E* __restrict w)
 {
     using S = Points<E, kSrc>;
-    using D = Points<E, kDst>;
     constexpr unsigned int groupBits = kGroup == 4 ? 2 : 3;
-    constexpr std::size_t lanes = kDst == Form::kBlocked ? kLanes<E> : kGroup;
     const unsigned int bits = order - groupBits;
     const std::size_t quarter = std::size_t(1) << bits;  // n / kGroup
     const std::size_t spread = quarter / kRun;
@@ -151,6 +143,8 @@ template <class E, Form kSrc, Form kDst, bool kConjugate, std::size_t kGroup>
                 im[t][l] = kConjugate ? -S::Im(srcRe, srcIm, p, 0) : S::Im(srcRe, srcIm, p, 0);
             }
         }
+        // Kept a loop so that g++ vectorises it across the run rather than
+        // unrolling it first.
 #pragma GCC unroll 1
         for (std::size_t l = 0; l < kRun; ++l) {
             E r[kGroup], m[kGroup];
@@ -165,11 +159,12 @@ template <class E, Form kSrc, Form kDst, bool kConjugate, std::size_t kGroup>
             }
         }
         for (std::size_t l = 0; l < kRun; ++l) {
-            const std::size_t g = g0 + (std::size_t(kReversedBytes.value[l]) >> 6) * spread;
+            E r[kGroup], m[kGroup];
             for (std::size_t t = 0; t < kGroup; ++t) {
-                D::Re(dstRe, dstIm, kGroup * g + t - t % lanes, t % lanes) = re[t][l];
-                D::Im(dstRe, dstIm, kGroup * g + t - t % lanes, t % lanes) = im[t][l];
+                r[t] = re[t][l];
+                m[t] = im[t][l];
             }
+            StoreGroup<E, kDst, kGroup>(dstRe, dstIm, g0 + ReversedPosition<kRun>(l) * spread, r, m);
         }
     }
 }
@@ -179,10 +174,10 @@ template <class E, Form kSrc, Form kDst, bool kConjugate, std::size_t kGroup>
 template <class E, Form kSrc, Form kDst, bool kConjugate, std::size_t kGroup>
 void FirstPass(std::uint32_t order, const E* srcRe, const E* srcIm, E* dstRe, E* dstIm, const E* w)
 {
-    if ((std::size_t(1) << order) >= kRun * kGroup) {
-        GatherFirstStagesByRuns<E, kSrc, kDst, kConjugate, kGroup>(order, srcRe, srcIm, dstRe, dstIm, w);
+    if ((std::size_t(1) << order) == kGroup) {
+        GatherOneGroup<E, kSrc, kDst, kConjugate, kGroup>(srcRe, srcIm, dstRe, dstIm, w);
     } else {
-        GatherFirstStages<E, kSrc, kDst, kConjugate, kGroup>(order, srcRe, srcIm, dstRe, dstIm, w);
+        GatherFirstStagesByRuns<E, kSrc, kDst, kConjugate, kGroup>(order, srcRe, srcIm, dstRe, dstIm, w);
     }
 }
 
@@ -191,20 +186,14 @@ void FirstPass(std::uint32_t order, const E* srcRe, const E* srcIm, E* dstRe, E*
 template <class E, bool kConjugate, std::size_t kGroup>
 [[gnu::noinline]] void FirstStagesInPlace(std::size_t groups, E* __restrict data, const E* __restrict w)
 {
-    using D = Points<E, Form::kBlocked>;
-    constexpr std::size_t lanes = kLanes<E>;
     for (std::size_t g = 0; g < groups; ++g) {
-        E* group = data + 2 * kGroup * g;
         E r[kGroup], m[kGroup];
         for (std::size_t t = 0; t < kGroup; ++t) {
-            r[t] = group[2 * t];
-            m[t] = kConjugate ? -group[2 * t + 1] : group[2 * t + 1];
+            r[t] = data[2 * (kGroup * g + t)];
+            m[t] = kConjugate ? -data[2 * (kGroup * g + t) + 1] : data[2 * (kGroup * g + t) + 1];
         }
         FirstStages<E, kGroup>(r, m, w);
-        for (std::size_t t = 0; t < kGroup; ++t) {
-            D::Re(group, group, t - t % lanes, t % lanes) = r[t];
-            D::Im(group, group, t - t % lanes, t % lanes) = m[t];
-        }
+        StoreGroup<E, Form::kBlocked, kGroup>(data, data, g, r, m);
     }
 }
 
