@@ -145,7 +145,9 @@ template <class E, Form kSrc, Form kDst, bool kConjugate, std::size_t kGroup>
         }
         // Kept a loop so that g++ vectorises it across the run rather than
         // unrolling it first.
+#if defined(__GNUC__)
 #pragma GCC unroll 1
+#endif
         for (std::size_t l = 0; l < kRun; ++l) {
             E r[kGroup], m[kGroup];
             for (std::size_t t = 0; t < kGroup; ++t) {
