@@ -22,6 +22,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <type_traits>
 
 #include "transform/FFT/Butterflies.h"
 #include "transform/FFT/FFTPlan.h"
@@ -238,20 +239,44 @@ void TwoPoints(const E* srcRe, const E* srcIm, std::size_t srcStep, E* re, E* im
     im[step] = kInverse ? yi * negScale : yi;
 }
 
-// The transform of plan.size points (2 or more) read from a distinct source
-// in form kSrc, worked on in re/im in form F and left as kOut says.
-template <class E, Form kSrc, Form F, Output kOut, bool kInverse>
-void TransformFrom(const FFTPlan<E>& plan, const E* srcRe, const E* srcIm, E* re, E* im, E* outRe, E* outIm)
+// The first pass, by groups of 4 points for even orders and 8 for odd ones
+// (so that an even number of stages remains for the pairs), then the
+// remaining stages. firstPass(group, w) runs the pass for that group size.
+template <class E, Form F, Output kOut, bool kInverse, class FirstPassFn>
+void StagesFrom(const FFTPlan<E>& plan, E* re, E* im, E* outRe, E* outIm, FirstPassFn firstPass)
 {
     const StageThreeFactors<E> factors(plan);
     const E scale = E(1) / static_cast<E>(plan.size);
     if ((plan.order & 1u) == 0) {
-        FirstPass<E, kSrc, F, kInverse, 4>(plan.order, srcRe, srcIm, re, im, factors.w);
+        firstPass(std::integral_constant<std::size_t, 4>{}, factors.w);
         RemainingStages<E, F, kOut, kInverse>(plan, 3, re, im, outRe, outIm, scale);
     } else {
-        FirstPass<E, kSrc, F, kInverse, 8>(plan.order, srcRe, srcIm, re, im, factors.w);
+        firstPass(std::integral_constant<std::size_t, 8>{}, factors.w);
         RemainingStages<E, F, kOut, kInverse>(plan, 4, re, im, outRe, outIm, scale);
     }
+}
+
+// The transform of plan.size points read from a distinct source in form
+// kSrc, worked on in re/im in form F and left as kOut says. One point is
+// copied as it is; two take a single butterfly.
+template <class E, Form kSrc, Form F, Output kOut, bool kInverse>
+void TransformFrom(const FFTPlan<E>& plan, const E* srcRe, const E* srcIm, E* re, E* im, E* outRe, E* outIm)
+{
+    if (plan.size <= 2) {
+        E* finalRe = kOut == Output::kSplitArrays ? outRe : re;
+        E* finalIm = kOut == Output::kSplitArrays ? outIm : kOut == Output::kPairsInPlace ? re + 1 : im;
+        const std::size_t finalStep = kOut == Output::kPairsInPlace ? 2 : 1;
+        if (plan.size == 1) {
+            finalRe[0] = srcRe[0];
+            finalIm[0] = srcIm[0];
+        } else {
+            TwoPoints<E, kInverse>(srcRe, srcIm, Points<E, kSrc>::Offset(1), finalRe, finalIm, finalStep);
+        }
+        return;
+    }
+    StagesFrom<E, F, kOut, kInverse>(plan, re, im, outRe, outIm, [&](auto group, const E* w) {
+        FirstPass<E, kSrc, F, kInverse, decltype(group)::value>(plan.order, srcRe, srcIm, re, im, w);
+    });
 }
 
 // Interleaved pairs in place: the swap-table exchanges, then the same
@@ -266,17 +291,11 @@ void PairsInPlace(const FFTPlan<E>& plan, E* pairs)
         return;
     }
     SwapByTable(n, plan.swapTable, pairs);
-    const StageThreeFactors<E> factors(plan);
-    const E scale = E(1) / static_cast<E>(n);
-    if ((plan.order & 1u) == 0) {
-        FirstStagesInPlace<E, kInverse, 4>(n / 4, pairs, factors.w);
-        RemainingStages<E, Form::kBlocked, Output::kPairsInPlace, kInverse>(plan, 3, pairs, pairs, nullptr, nullptr,
-                                                                            scale);
-    } else {
-        FirstStagesInPlace<E, kInverse, 8>(n / 8, pairs, factors.w);
-        RemainingStages<E, Form::kBlocked, Output::kPairsInPlace, kInverse>(plan, 4, pairs, pairs, nullptr, nullptr,
-                                                                            scale);
-    }
+    StagesFrom<E, Form::kBlocked, Output::kPairsInPlace, kInverse>(
+        plan, pairs, pairs, nullptr, nullptr, [&](auto group, const E* w) {
+            constexpr std::size_t kGroup = decltype(group)::value;
+            FirstStagesInPlace<E, kInverse, kGroup>(n / kGroup, pairs, w);
+        });
 }
 
 // Interleaved pairs from a distinct source into dst, which is also the
@@ -284,16 +303,6 @@ void PairsInPlace(const FFTPlan<E>& plan, E* pairs)
 template <class E, bool kInverse>
 void PairsInto(const FFTPlan<E>& plan, const E* src, E* dst)
 {
-    const std::size_t n = plan.size;
-    if (n == 1) {
-        dst[0] = src[0];
-        dst[1] = src[1];
-        return;
-    }
-    if (n == 2) {
-        TwoPoints<E, kInverse>(src, src + 1, 2, dst, dst + 1, 2);
-        return;
-    }
     TransformFrom<E, Form::kPairs, Form::kBlocked, Output::kPairsInPlace, kInverse>(plan, src, src + 1, dst, dst,
                                                                                    nullptr, nullptr);
 }
@@ -305,16 +314,6 @@ void PairsInto(const FFTPlan<E>& plan, const E* src, E* dst)
 template <class E, bool kInverse>
 void SplitVia(const FFTPlan<E>& plan, const E* srcRe, const E* srcIm, E* work, E* re, E* im)
 {
-    const std::size_t n = plan.size;
-    if (n == 1) {
-        re[0] = srcRe[0];
-        im[0] = srcIm[0];
-        return;
-    }
-    if (n == 2) {
-        TwoPoints<E, kInverse>(srcRe, srcIm, 1, re, im, 1);
-        return;
-    }
     TransformFrom<E, Form::kSplit, Form::kBlocked, Output::kSplitArrays, kInverse>(plan, srcRe, srcIm, work, work,
                                                                                   re, im);
 }
@@ -324,15 +323,6 @@ void SplitVia(const FFTPlan<E>& plan, const E* srcRe, const E* srcIm, E* work, E
 template <class E>
 void PairsToSplitForward(const FFTPlan<E>& plan, const E* src, E* re, E* im)
 {
-    if (plan.size == 1) {
-        re[0] = src[0];
-        im[0] = src[1];
-        return;
-    }
-    if (plan.size == 2) {
-        TwoPoints<E, false>(src, src + 1, 2, re, im, 1);
-        return;
-    }
     TransformFrom<E, Form::kPairs, Form::kSplit, Output::kInPlace, false>(plan, src, src + 1, re, im, nullptr, nullptr);
 }
 
