@@ -37,6 +37,24 @@ T FromBits(BitsType<T> bits)
     return value;
 }
 
+// The quiet NaN of T with `payload` in its low fraction bits and a clear sign.
+template <class T>
+T QuietNaN(std::uint64_t payload = 0)
+{
+    return FromBits<T>(Bits(std::numeric_limits<T>::quiet_NaN()) | static_cast<BitsType<T>>(payload));
+}
+
+// KESTACCEL_PROBE(Name, call written with T): Name<T>::value tells whether the
+// call compiles, so that overloads left out on purpose stay out. Arg<U>() is a
+// value of type U for such unevaluated calls.
+template <class U>
+U Arg();
+#define KESTACCEL_PROBE(Name, ...)                                           \
+    template <class T, class = void>                                          \
+    struct Name : std::false_type {};                                         \
+    template <class T>                                                        \
+    struct Name<T, std::void_t<decltype(__VA_ARGS__)>> : std::true_type {};
+
 // Equality of bit patterns, printed in hex, so that -0 against +0 and one NaN
 // payload against another both fail.
 template <class T>
@@ -148,6 +166,14 @@ inline std::string SeedTrace(std::uint32_t seed) { return "seed " + std::to_stri
 inline const std::vector<unsigned int>& InterestingSizes()
 {
     static const std::vector<unsigned int> sizes = {1, 2, 3, 4, 5, 7, 8, 15, 16, 17, 31, 32, 33, 63, 64, 65, 127, 1023, 4099};
+    return sizes;
+}
+
+// The same sizes with 0 first, which must write nothing.
+inline std::vector<unsigned int> SizesWithZero()
+{
+    std::vector<unsigned int> sizes = InterestingSizes();
+    sizes.insert(sizes.begin(), 0u);
     return sizes;
 }
 
