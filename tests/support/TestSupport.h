@@ -55,6 +55,10 @@ U Arg();
     template <class T>                                                        \
     struct Name<T, std::void_t<decltype(__VA_ARGS__)>> : std::true_type {};
 
+// A deliberate gap: the probe sees the overload for Has and none for Lacks.
+template <template <class...> class Probe, class Has, class Lacks>
+constexpr bool kGap = Probe<Has>::value && !Probe<Lacks>::value;
+
 // Equality of bit patterns, printed in hex, so that -0 against +0 and one NaN
 // payload against another both fail.
 template <class T>
