@@ -45,7 +45,8 @@ std::vector<T> Operands(std::size_t n, std::uint32_t seed, bool second)
 
 // A member as run(n, a, b, dst) with dst holding `before` on entry, and its
 // definition ref(a, b, before). For the constant forms a[0] is the constant
-// and b the source; the in-place forms run on a copy of b in dst.
+// and b the source (so SubConstant's x - c is `sub`); the in-place forms run
+// on a copy of b in dst.
 template <class T>
 struct Case {
     const char* name;
@@ -54,48 +55,41 @@ struct Case {
     T (*ref)(T a, T b, T before);
 };
 
+#define VECTOR(F) [](U n, P a, P b, T* d) { ku::F(n, a, b, d); }
+#define VECTOR_IN_PLACE(F) [](U n, P a, P b, T* d) { ku::Copy(n, b, d); ku::F(n, a, d); }
+#define CONSTANT_IN_PLACE(F) [](U n, P c, P s, T* d) { ku::Copy(n, s, d); ku::F(n, d, *c); }
 using U = unsigned int;
 template <class T>
 std::vector<Case<T>> Cases()
 {
     using P = const T*;
+    using R = T (*)(T, T, T);
+    const R add = [](T a, T b, T) { return a + b; }, sub = [](T a, T b, T) { return b - a; };
+    const R mul = [](T a, T b, T) { return a * b; }, div = [](T a, T b, T) { return b / a; };
+    const R rev = [](T c, T x, T) { return c - x; };
     std::vector<Case<T>> cases = {
-        {"Add", false, false, [](U n, P a, P b, T* d) { ku::Add(n, a, b, d); }, [](T a, T b, T) { return a + b; }},
-        {"Sub", false, false, [](U n, P a, P b, T* d) { ku::Sub(n, a, b, d); }, [](T a, T b, T) { return b - a; }},
-        {"Mul", false, false, [](U n, P a, P b, T* d) { ku::Mul(n, a, b, d); }, [](T a, T b, T) { return a * b; }},
-        {"Div", false, false, [](U n, P a, P b, T* d) { ku::Div(n, a, b, d); }, [](T a, T b, T) { return b / a; }},
-        {"AddProduct", false, false, [](U n, P a, P b, T* d) { ku::AddProduct(n, a, b, d); },
-         [](T a, T b, T d) { return T(a * b) + d; }},
-        {"Add_InPlace", false, true, [](U n, P a, P b, T* d) { ku::Copy(n, b, d); ku::Add_InPlace(n, a, d); },
-         [](T a, T b, T) { return a + b; }},
-        {"Sub_InPlace", false, true, [](U n, P a, P b, T* d) { ku::Copy(n, b, d); ku::Sub_InPlace(n, a, d); },
-         [](T a, T b, T) { return b - a; }},
-        {"Mul_InPlace", false, true, [](U n, P a, P b, T* d) { ku::Copy(n, b, d); ku::Mul_InPlace(n, a, d); },
-         [](T a, T b, T) { return a * b; }},
-        {"Div_InPlace", false, true, [](U n, P a, P b, T* d) { ku::Copy(n, b, d); ku::Div_InPlace(n, a, d); },
-         [](T a, T b, T) { return b / a; }},
-        {"AddConstant", true, false, [](U n, P c, P s, T* d) { ku::AddConstant(n, s, *c, d); },
-         [](T c, T x, T) { return c + x; }},
-        {"SubConstant", true, false, [](U n, P c, P s, T* d) { ku::SubConstant(n, s, *c, d); },
-         [](T c, T x, T) { return x - c; }},
-        {"SubConstantRev", true, false, [](U n, P c, P s, T* d) { ku::SubConstantRev(n, s, *c, d); },
-         [](T c, T x, T) { return c - x; }},
-        {"MulConstant", true, false, [](U n, P c, P s, T* d) { ku::MulConstant(n, s, d, *c); },
-         [](T c, T x, T) { return c * x; }},
+        {"Add", false, false, VECTOR(Add), add},
+        {"Sub", false, false, VECTOR(Sub), sub},
+        {"Mul", false, false, VECTOR(Mul), mul},
+        {"Div", false, false, VECTOR(Div), div},
+        {"AddProduct", false, false, VECTOR(AddProduct), [](T a, T b, T d) { return T(a * b) + d; }},
+        {"Add_InPlace", false, true, VECTOR_IN_PLACE(Add_InPlace), add},
+        {"Sub_InPlace", false, true, VECTOR_IN_PLACE(Sub_InPlace), sub},
+        {"Mul_InPlace", false, true, VECTOR_IN_PLACE(Mul_InPlace), mul},
+        {"Div_InPlace", false, true, VECTOR_IN_PLACE(Div_InPlace), div},
+        {"AddConstant", true, false, [](U n, P c, P s, T* d) { ku::AddConstant(n, s, *c, d); }, add},
+        {"SubConstant", true, false, [](U n, P c, P s, T* d) { ku::SubConstant(n, s, *c, d); }, sub},
+        {"SubConstantRev", true, false, [](U n, P c, P s, T* d) { ku::SubConstantRev(n, s, *c, d); }, rev},
+        {"MulConstant", true, false, [](U n, P c, P s, T* d) { ku::MulConstant(n, s, d, *c); }, mul},
         {"DivConstant", true, false, [](U n, P c, P s, T* d) { ku::DivConstant(n, s, d, *c); },
          [](T c, T x, T d) { return c == T(0) ? d : x / c; }},
         {"AddConstantProduct", true, false, [](U n, P c, P s, T* d) { ku::AddConstantProduct(n, s, d, *c); },
          [](T c, T x, T d) { return T(x * c) + d; }},
-        {"AddConstant_InPlace", true, true, [](U n, P c, P s, T* d) { ku::Copy(n, s, d); ku::AddConstant_InPlace(n, d, *c); },
-         [](T c, T x, T) { return c + x; }},
-        {"SubConstant_InPlace", true, true, [](U n, P c, P s, T* d) { ku::Copy(n, s, d); ku::SubConstant_InPlace(n, d, *c); },
-         [](T c, T x, T) { return x - c; }},
-        {"SubConstantRev_InPlace", true, true,
-         [](U n, P c, P s, T* d) { ku::Copy(n, s, d); ku::SubConstantRev_InPlace(n, d, *c); },
-         [](T c, T x, T) { return c - x; }},
-        {"MulConstant_InPlace", true, true, [](U n, P c, P s, T* d) { ku::Copy(n, s, d); ku::MulConstant_InPlace(n, d, *c); },
-         [](T c, T x, T) { return c * x; }},
-        {"DivConstant_InPlace", true, true, [](U n, P c, P s, T* d) { ku::Copy(n, s, d); ku::DivConstant_InPlace(n, d, *c); },
+        {"AddConstant_InPlace", true, true, CONSTANT_IN_PLACE(AddConstant_InPlace), add},
+        {"SubConstant_InPlace", true, true, CONSTANT_IN_PLACE(SubConstant_InPlace), sub},
+        {"SubConstantRev_InPlace", true, true, CONSTANT_IN_PLACE(SubConstantRev_InPlace), rev},
+        {"MulConstant_InPlace", true, true, CONSTANT_IN_PLACE(MulConstant_InPlace), mul},
+        {"DivConstant_InPlace", true, true, CONSTANT_IN_PLACE(DivConstant_InPlace),
          [](T c, T x, T) { return c == T(0) ? x : x / c; }},
     };
     if constexpr (HasDivConstantRev<T>::value)
@@ -103,6 +97,9 @@ std::vector<Case<T>> Cases()
                          [](T c, T x, T d) { return c == T(0) ? d : c / x; }});
     return cases;
 }
+#undef VECTOR
+#undef VECTOR_IN_PLACE
+#undef CONSTANT_IN_PLACE
 
 // Each member on every size, count 0 with null pointers, the sentinel, and
 // with dst one element ahead of its (first) source, where the ascending loop
