@@ -5,6 +5,8 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <cmath>
 #include <complex>
 #include <cstdint>
 #include <cstring>
@@ -142,6 +144,49 @@ private:
     std::size_t count_;
     std::vector<T> storage_;
 };
+
+// out[i] against ref(in[i]) (or ref(in[i], i)) bit for bit, with the sentinel
+// and count 0; `member` takes (count, src, dst) or, on a copy of the input,
+// (count, srcDst). Where it reads and writes one type, dst one element ahead
+// of or behind src must give the plain ascending loop's result; there a NaN
+// may meet another NaN and keep either payload, so any NaN matches a NaN.
+template <class E, class Ref, class Member>
+void ExpectMatches(const std::vector<E>& in, Ref ref, Member member)
+{
+    const auto at = [&ref](E x, std::size_t i) {
+        if constexpr (std::is_invocable<Ref, E, std::size_t>::value) return ref(x, i);
+        else return ref(x);
+    };
+    using D = decltype(at(E(), 0));
+    constexpr bool inPlace = std::is_invocable<Member, unsigned int, E*>::value;
+    const auto n = static_cast<unsigned int>(in.size());
+    GuardedBuffer<D> out(n), none(0);
+    if constexpr (inPlace) {
+        std::copy(in.begin(), in.end(), out.data());
+        member(n, out.data());
+        member(0u, none.data());
+    } else {
+        member(n, in.data(), out.data());
+        member(0u, static_cast<const E*>(nullptr), none.data());
+    }
+    for (std::size_t i = 0; i < n; ++i) ASSERT_TRUE(SameBits(at(in[i], i), out[i])) << "at index " << i << " of " << n;
+    EXPECT_TRUE(out.Intact() && none.Intact());
+    if constexpr (!inPlace && std::is_same<D, E>::value) {
+        for (const std::size_t ahead : {1, 0}) {
+            std::vector<E> buffer(in);
+            buffer.push_back(E(0.75));
+            auto chained = buffer;
+            for (std::size_t i = 0; i < n; ++i) chained[i + ahead] = at(chained[i + 1 - ahead], i);
+            member(n, buffer.data() + 1 - ahead, buffer.data() + ahead);
+            for (std::size_t i = 0; i <= n; ++i) {
+                if constexpr (std::is_floating_point<E>::value)
+                    if (std::isnan(chained[i]) && std::isnan(buffer[i])) continue;
+                ASSERT_TRUE(SameBits(chained[i], buffer[i])) << "at index " << i << " with dst one element "
+                                                             << (ahead ? "ahead" : "behind");
+            }
+        }
+    }
+}
 
 // Reproducible random data. Each test names its seed; a failure message
 // carries it through SCOPED_TRACE so that the case can be replayed.
