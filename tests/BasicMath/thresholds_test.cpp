@@ -5,7 +5,7 @@
 #include <kestaccel/BasicMath.h>
 
 #include <cmath>
-#include <functional>
+#include <random>
 #include <utility>
 
 #include "support/TestSupport.h"
@@ -21,40 +21,25 @@ KESTACCEL_PROBE(HasThresholdLT, ku::Threshold_LT_InPlace(0u, Arg<T*>(), Arg<T>()
 static_assert(kGap<HasTrim, float, double> && kGap<HasThresholdLT, double, std::complex<double>> &&
                   kGap<HasThresholdLT, float, std::complex<float>>, "uneven on purpose");
 
-// Each member with its definition written out as the scalar rule for one
-// element, (level, value) being (low, high) for Trim. In-place members run
-// on a copy of the source in dst.
-template <class T>
-struct ThresholdCase {
-    std::string name;
-    bool inPlace;
-    std::function<void(unsigned int n, T* dst, const T* src, T level, T value)> run;
-    std::function<T(T x, T level, T value)> rule;
-};
-
-template <class T>
-std::vector<ThresholdCase<T>> ThresholdCases()
+// Each member with (level, value), (low, high) for Trim, and its rule for one
+// element, handed to check(name, rule, member).
+template <class T, class Check>
+void EachMember(T level, T value, Check check)
 {
-    std::vector<ThresholdCase<T>> cases = {
-        {"Threshold_LT_InPlace", true, [](auto n, T* d, const T*, T l, T) { ku::Threshold_LT_InPlace(n, d, l); },
-         [](T x, T level, T) { return level > x ? level : x; }},
-        {"Threshold_GT_InPlace", true, [](auto n, T* d, const T*, T l, T) { ku::Threshold_GT_InPlace(n, d, l); },
-         [](T x, T level, T) { return level < x ? level : x; }},
-        {"Threshold_LTVal", false, [](auto n, T* d, const T* s, T l, T v) { ku::Threshold_LTVal(n, s, d, l, v); },
-         [](T x, T level, T value) { return level > x ? value : x; }},
-        {"Threshold_LTVal_InPlace", true,
-         [](auto n, T* d, const T*, T l, T v) { ku::Threshold_LTVal_InPlace(n, d, l, v); },
-         [](T x, T level, T value) { return level > x ? value : x; }},
-        {"Threshold_GTVal", false, [](auto n, T* d, const T* s, T l, T v) { ku::Threshold_GTVal(n, s, d, l, v); },
-         [](T x, T level, T value) { return x > level ? value : x; }},
-        {"Threshold_GTVal_InPlace", true,
-         [](auto n, T* d, const T*, T l, T v) { ku::Threshold_GTVal_InPlace(n, d, l, v); },
-         [](T x, T level, T value) { return x > level ? value : x; }},
-    };
-    if constexpr (std::is_same<T, float>::value)
-        cases.push_back({"Trim", true, [](auto n, T* d, const T*, T low, T high) { ku::Trim(n, d, low, high); },
-                         [](T x, T low, T high) { return low > x ? low : (high < x ? high : x); }});
-    return cases;
+    using U = unsigned int;
+    const auto lt = [=](T x) { return level > x ? value : x; };
+    const auto gt = [=](T x) { return x > level ? value : x; };
+    check("Threshold_LT_InPlace", [=](T x) { return level > x ? level : x; },
+          [=](U n, T* io) { ku::Threshold_LT_InPlace(n, io, level); });
+    check("Threshold_GT_InPlace", [=](T x) { return level < x ? level : x; },
+          [=](U n, T* io) { ku::Threshold_GT_InPlace(n, io, level); });
+    check("Threshold_LTVal", lt, [=](U n, const T* s, T* d) { ku::Threshold_LTVal(n, s, d, level, value); });
+    check("Threshold_LTVal_InPlace", lt, [=](U n, T* io) { ku::Threshold_LTVal_InPlace(n, io, level, value); });
+    check("Threshold_GTVal", gt, [=](U n, const T* s, T* d) { ku::Threshold_GTVal(n, s, d, level, value); });
+    check("Threshold_GTVal_InPlace", gt, [=](U n, T* io) { ku::Threshold_GTVal_InPlace(n, io, level, value); });
+    if constexpr (HasTrim<T>::value)
+        check("Trim", [=](T x) { return level > x ? level : (value < x ? value : x); },
+              [=](U n, T* io) { ku::Trim(n, io, level, value); });
 }
 
 template <class T>
@@ -62,28 +47,23 @@ class Thresholds : public ::testing::Test {};
 using FloatingTypes = ::testing::Types<float, double>;
 TYPED_TEST_SUITE(Thresholds, FloatingTypes);
 
-template <class T>
-std::vector<T> RunCase(const ThresholdCase<T>& c, const std::vector<T>& src, T level, T value)
-{
-    // An out-of-place member must write every element, so dst starts as a NaN.
-    GuardedBuffer<T> dst(src.size(), QuietNaN<T>(0x7E));
-    for (std::size_t i = 0; c.inPlace && i < src.size(); ++i) dst[i] = src[i];
-    c.run(static_cast<unsigned int>(src.size()), dst.data(), src.data(), level, value);
-    EXPECT_TRUE(dst.Intact()) << c.name;
-    return dst.values();
-}
-
 // By hand: +0 against -0 and a NaN level leave every element's own bits.
 TYPED_TEST(Thresholds, SignedZerosAndNaNLevelPass)
 {
     using T = TypeParam;
     const std::vector<T> x = {T(-3), QuietNaN<T>(0x55), T(3), -QuietNaN<T>(0x99), T(0)}, zeros = {T(0), -T(0)};
-    for (const auto& c : ThresholdCases<T>()) {
-        SCOPED_TRACE(c.name);
-        EXPECT_TRUE(SameBitsArray(x, RunCase(c, x, QuietNaN<T>(1), T(7))));
-        EXPECT_TRUE(SameBitsArray(zeros, RunCase(c, zeros, -T(0), T(9))));
-        EXPECT_TRUE(SameBitsArray(zeros, RunCase(c, zeros, T(0), T(9))));
-    }
+    const auto stands = [](const std::vector<T>& in) {
+        return [&in](const char* name, auto, auto member) {
+            constexpr bool inPlace = std::is_invocable<decltype(member), unsigned int, T*>::value;
+            std::vector<T> out = inPlace ? in : std::vector<T>(in.size(), QuietNaN<T>(0x7E));
+            if constexpr (inPlace) member(static_cast<unsigned int>(in.size()), out.data());
+            else member(static_cast<unsigned int>(in.size()), in.data(), out.data());
+            EXPECT_TRUE(SameBitsArray(in, out)) << name;
+        };
+    };
+    EachMember(QuietNaN<T>(1), T(7), stands(x));
+    EachMember(T(0), T(9), stands(zeros));
+    EachMember(-T(0), T(9), stands(zeros));
 }
 
 // Random data with ties against the level, signed zeros and NaNs.
@@ -108,23 +88,16 @@ TYPED_TEST(Thresholds, MatchTheScalarRuleOnRandomAndOverlappingData)
     const std::pair<T, T> parameters[] = {
         {T(0.25), T(-9.5)}, {T(-0.5), T(0.75)}, {-T(0), QuietNaN<T>(0x42)}, {QuietNaN<T>(0x24), T(7)}};
     std::uint32_t seed = 2000;
-    for (const auto& c : ThresholdCases<T>()) {
-        for (const auto& [level, value] : parameters) {
-            for (unsigned int n : SizesWithZero()) {
-                SCOPED_TRACE(c.name + " size " + std::to_string(n) + " " + SeedTrace(seed));
-                const auto x = LevelRichReals<T>(n, seed++, level);
-                std::vector<T> expected(n);
-                for (std::size_t i = 0; i < n; ++i) expected[i] = c.rule(x[i], level, value);
-                EXPECT_TRUE(SameBitsArray(expected, RunCase(c, x, level, value)));
-            }
+    for (const auto& [level, value] : parameters) {
+        for (unsigned int n : InterestingSizes()) {
+            SCOPED_TRACE(::testing::Message() << "level " << level << " value " << value << " size " << n << " "
+                                              << SeedTrace(seed));
+            const auto x = LevelRichReals<T>(n, seed++, level);
+            EachMember(level, value, [&x](const char* name, auto rule, auto member) {
+                SCOPED_TRACE(name);
+                ExpectMatches(x, rule, member);
+            });
         }
-        if (c.inPlace) continue;
-        // dst one element behind src: the replacement written at i is read
-        // as the source of i + 1.
-        auto buffer = LevelRichReals<T>(132, seed++, T(0)), expected = buffer;
-        for (std::size_t i = 0; i + 1 < buffer.size(); ++i) expected[i + 1] = c.rule(expected[i], T(0), T(3));
-        c.run(131u, buffer.data() + 1, buffer.data(), T(0), T(3));
-        EXPECT_TRUE(SameBitsArray(expected, buffer)) << c.name << " overlapping";
     }
 }
 
@@ -132,12 +105,15 @@ TYPED_TEST(Thresholds, MatchTheScalarRuleOnRandomAndOverlappingData)
 // becomes high. A NaN bound disables its side.
 TEST(TrimFloat, LowIsTestedFirstAndNaNPasses)
 {
-    const auto trim = ThresholdCases<float>().back();
+    const auto trim = [](std::vector<float> x, float low, float high) {
+        ku::Trim(static_cast<unsigned int>(x.size()), x.data(), low, high);
+        return x;
+    };
     const float nan = QuietNaN<float>(0x321);
-    EXPECT_TRUE(SameBitsArray({-1, -1, 0, 1, 1}, RunCase(trim, {-2, -1, 0, 1, 2}, -1.0f, 1.0f)));
-    EXPECT_TRUE(SameBitsArray({1, 1, -1}, RunCase(trim, {-2, 0, 2}, 1.0f, -1.0f)));
-    EXPECT_TRUE(SameBitsArray({-5, 1}, RunCase(trim, {-5, 5}, nan, 1.0f)));
-    EXPECT_TRUE(SameBitsArray({-1, 5}, RunCase(trim, {-5, 5}, -1.0f, nan)));
+    EXPECT_TRUE(SameBitsArray({-1, -1, 0, 1, 1}, trim({-2, -1, 0, 1, 2}, -1.0f, 1.0f)));
+    EXPECT_TRUE(SameBitsArray({1, 1, -1}, trim({-2, 0, 2}, 1.0f, -1.0f)));
+    EXPECT_TRUE(SameBitsArray({-5, 1}, trim({-5, 5}, nan, 1.0f)));
+    EXPECT_TRUE(SameBitsArray({-1, 5}, trim({-5, 5}, -1.0f, nan)));
 }
 
 // ---------------------------------------------------------------------------
