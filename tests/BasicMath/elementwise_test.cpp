@@ -64,12 +64,6 @@ struct Runtime {
 #endif
 };
 
-template <class T>
-T NegativeNaN()
-{
-    return -QuietNaN<T>(0x123);
-}
-
 // What Abs_InPlace does: the sign bit cleared, whatever the value.
 template <class T>
 T ClearSign(T x)
@@ -82,7 +76,7 @@ template <class T>
 std::vector<T> WithSpecials(std::vector<T> values)
 {
     const T inf = std::numeric_limits<T>::infinity();
-    const T specials[] = {T(0), -T(0), inf, -inf, std::numeric_limits<T>::quiet_NaN(), NegativeNaN<T>(),
+    const T specials[] = {T(0), -T(0), inf, -inf, std::numeric_limits<T>::quiet_NaN(), -QuietNaN<T>(0x123),
                           std::numeric_limits<T>::denorm_min(), T(-1), T(1), T(0.5), T(-2.5)};
     for (std::size_t k = 0; k < sizeof specials / sizeof specials[0] && k < values.size(); ++k)
         values[(k * 37) % values.size()] = specials[k];
@@ -209,12 +203,13 @@ TYPED_TEST(Elementwise, HandWorkedValues)
     EXPECT_TRUE(SameBitsArray(std::vector<T>{T(2), T(3), T(-2), T(-3), T(1), -T(0)}, rounded));
 
     // The two sign rules part on -0 and on a NaN with its sign bit set.
-    const std::vector<T> odd = {-T(0), NegativeNaN<T>(), T(-3)};
+    const T negativeNaN = -QuietNaN<T>(0x123);
+    const std::vector<T> odd = {-T(0), negativeNaN, T(-3)};
     std::vector<T> abs(3), absInPlace = odd;
     ku::Abs(3, odd.data(), abs.data());
     ku::Abs_InPlace(3, absInPlace.data());
-    EXPECT_TRUE(SameBitsArray(std::vector<T>{-T(0), NegativeNaN<T>(), T(3)}, abs));
-    EXPECT_TRUE(SameBitsArray(std::vector<T>{T(0), ClearSign(NegativeNaN<T>()), T(3)}, absInPlace));
+    EXPECT_TRUE(SameBitsArray(std::vector<T>{-T(0), negativeNaN, T(3)}, abs));
+    EXPECT_TRUE(SameBitsArray(std::vector<T>{T(0), ClearSign(negativeNaN), T(3)}, absInPlace));
 
     // Flip onto its own source ends as a palindrome of its last half.
     std::vector<T> four = {1, 2, 3, 4};
