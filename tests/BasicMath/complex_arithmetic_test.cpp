@@ -1,7 +1,5 @@
-// Complex arithmetic: the plain product on the components (no fusion, no
-// recovery of infinities), the scaled quotient with its branch order and its
-// one NaN, operand order, the zero test of the constant forms only, and the
-// ascending-loop semantics on overlapping buffers.
+// Complex arithmetic: the plain product (no fusion, no recovery of
+// infinities), the scaled quotient with its branch order and its one NaN.
 
 #include <kestaccel/BasicMath.h>
 
@@ -101,10 +99,8 @@ struct Case {
     bool constant;  // the first "vector" is then the constant, only its element 0 is read
 };
 
-// Each member on every size, out of place and in place (the second vector as
-// the buffer), with the sentinel and count 0, and with dst one element ahead
-// of the first source: the plain loop over whole elements. A zero constant
-// of a division leaves dst as it was.
+// Each member out of place and in place on every size, and with dst one
+// element ahead of the first source; a zero constant divisor writes nothing.
 TYPED_TEST(ComplexArithmetic, MembersMatchTheirDefinitions)
 {
     using T = TypeParam;
@@ -189,9 +185,8 @@ TYPED_TEST(ComplexArithmetic, HandWorkedValues)
     EXPECT_TRUE(SameBits(Z(2, 4), sub(Z(1, 1), Z(3, 5)))) << "Sub is the second vector minus the first";
     EXPECT_TRUE(SameBits(Z(2, 3), div(Z(2, 0), Z(4, 6)))) << "Div is the second vector over the first";
 
-    // The plain formula: inf * 0 in the imaginary part is NaN, and nothing
-    // recovers it, as a runtime complex multiply would. With (inf, inf) both
-    // parts are NaN where a recovering multiply would give (inf, inf).
+    // The plain formula: inf * 0 gives NaN parts that a runtime multiply would
+    // recover to infinities.
     for (const Z product : {mul(Z(inf, 0), Z(1, 0)), mulConstant(Z(inf, 0), Z(1, 0))})
         EXPECT_TRUE(SameBits(inf, product.real()) && std::isnan(product.imag()));
     EXPECT_TRUE(bothNaN(mul(Z(inf, inf), Z(1, 0))) && bothNaN(mulConstant(Z(1, 0), Z(inf, inf))));

@@ -1,7 +1,5 @@
-// Elementwise functions: each float member against the single-precision
-// runtime function (a widened double call differs in the last bit on some
-// inputs), the two sign rules of Abs, Flip against Flip_InPlace, the overflow
-// of CartToPolar against Magnitude, and both inverted thresholds.
+// Elementwise functions: the float members call the single-precision runtime
+// (a widened call differs in the last bit), and the odd rules of Abs and Flip.
 
 #include <kestaccel/BasicMath.h>
 
@@ -217,9 +215,8 @@ TYPED_TEST(Elementwise, HandWorkedValues)
     EXPECT_TRUE(SameBitsArray(std::vector<T>{4, 3, 3, 4}, four));
 }
 
-// CartToPolar sums the squares in float (3e19 overflows, which Magnitude
-// survives) and takes sqrtf and atan2f; PolarToCart multiplies cosf and sinf
-// by the magnitude.
+// CartToPolar: sqrtf of squares summed in float (3e19 overflows), atan2f;
+// PolarToCart: cosf and sinf times the magnitude.
 TEST(ElementwiseFloat, PolarConversionsUseTheFloatRuntime)
 {
     const std::uint32_t seed = 1900;
@@ -269,10 +266,8 @@ std::complex<T> InvertedWithThreshold(std::complex<T> z, T threshold)
     return {re / m, -im / m};
 }
 
-// Zero, negative, tiny and ordinary thresholds against the definitions; by
-// hand, the tiny threshold that sends negative elements to +infinity, a tiny
-// complex element in any direction, and a NaN threshold, which passes the
-// early test and is reached by no size (the sign of its NaN is not fixed).
+// By hand: a tiny threshold sends negatives to +infinity, a NaN threshold
+// passes the early test (its NaN's sign is not fixed), and tiny complex elements.
 TYPED_TEST(Elementwise, InvertThreshold)
 {
     using T = TypeParam;

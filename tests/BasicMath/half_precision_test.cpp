@@ -1,6 +1,4 @@
-// ConvertFloat2Half and ConvertHalf2Float: table rows both ways bit for bit,
-// every half word against its value, and random floats against the field
-// formula, with count-exact writes.
+// ConvertFloat2Half and ConvertHalf2Float: field-moving packing, bit for bit.
 
 #include <kestaccel/BasicMath.h>
 
@@ -54,9 +52,8 @@ TEST(HalfPrecision, TableRows)
     }
 }
 
-// Every half word against its value: sign * (1 + f/1024) * 2^(E - 15) for
-// every word but 0, whatever E is (0 and 31 included); and back, every word
-// but 0 survives the round trip unchanged.
+// Every word but 0 is sign * (1 + f/1024) * 2^(E - 15), E = 0 and 31 included,
+// and comes back unchanged.
 TEST(HalfPrecision, AllWords)
 {
     std::vector<unsigned short> words(65536);
@@ -74,9 +71,8 @@ TEST(HalfPrecision, AllWords)
     EXPECT_EQ(words, again.values());
 }
 
-// Random floats, count 0 included, half of them bit patterns of every kind
-// and half of ordinary size, against the fields written out with the
-// subtraction form of the exponent wrap.
+// Random bit patterns and floats of ordinary size against the fields moved by
+// hand, the exponent wrap written as a subtraction.
 TEST(HalfPrecision, RandomFloatsMatchFieldFormula)
 {
     for (unsigned int n : SizesWithZero()) {

@@ -1,6 +1,5 @@
-// Interleave and Deinterleave against plain loops on random data with NaN
-// payloads and -0, for one to eight channels, on overlapping buffers (where
-// only the frame-outer ascending order is right), and empty calls.
+// Interleave and Deinterleave against the plain frame-outer loops, values
+// moved bits and all, also on overlapping buffers.
 
 #include <kestaccel/BasicMath.h>
 
@@ -47,9 +46,7 @@ void PlainDeinterleave(unsigned int channels, unsigned int frames, const T* src,
         for (unsigned int c = 0; c < channels; ++c) destinations[c][f] = src[f * channels + c];
 }
 
-// Random planes interleave as the plain loop does, and that buffer
-// deinterleaves into the planes again; two channels also go through the
-// two-buffer forms.
+// Both ways on every size; two channels also through the two-buffer forms.
 TYPED_TEST(LayoutTest, MatchPlainLoops)
 {
     using T = TypeParam;
@@ -89,9 +86,8 @@ TYPED_TEST(LayoutTest, MatchPlainLoops)
     }
 }
 
-// The interleaved buffer over the first channel, and the first channel over
-// the interleaved source: two channels in the two-buffer forms, three in the
-// N-channel forms.
+// The interleaved buffer over the first channel and the reverse, two channels
+// in the two-buffer forms, three in the N-channel forms.
 TYPED_TEST(LayoutTest, OverlapFollowsAscendingOrder)
 {
     using T = TypeParam;

@@ -1,7 +1,5 @@
-// Reductions and statistics: strict ascending summation from +0 in the
-// element's type (the float NormL2 alone accumulating in double), the
-// two-pass sample deviation, the tie-breaks and NaN behaviour of the scans,
-// and the bit-exact selection of MaxEvery/MinEvery.
+// Reductions: strict ascending sums from +0 in the element's type, the
+// tie-breaks and NaN rules of the scans, and MaxEvery/MinEvery.
 
 #include <kestaccel/BasicMath.h>
 #include <kestaccel/DSP.h>
@@ -106,9 +104,8 @@ TYPED_TEST(Reductions, SumsMatchTheSequentialLoops)
     EXPECT_TRUE(SameBits(QuietNaN<T>(0x5), deviation));
 }
 
-// Sum adds in float: left to right 1e8 + 1 loses the 1. NormL2 squares in
-// float (1e20 squared overflows) and sums in double: 100000 squares of 0.1f
-// drift in a float accumulator.
+// Sum adds in float (1e8 + 1 loses the 1); NormL2 squares in float (1e20
+// overflows) and sums in double (a float sum of 100000 squares drifts).
 TEST(ReductionsFloat, SumAddsInFloatAndNormL2SquaresInFloatAndSumsInDouble)
 {
     const float large[] = {1e8f, 1.0f, -1e8f}, big = 1e20f;
@@ -137,10 +134,6 @@ TYPED_TEST(Reductions, DotProductRoundsEachProductBeforeAdding)
     ASSERT_NE(T(0), std::fma(a, a, c)) << "the case must tell a fused step apart";
     EXPECT_TRUE(SameBits(T(0), ku::DotProduct(2u, x, y)));
 }
-
-// ---------------------------------------------------------------------------
-// Scans.
-// ---------------------------------------------------------------------------
 
 // Random data rich in ties, signed zeros and NaNs of distinct payloads.
 template <class T>
@@ -185,9 +178,8 @@ TEST(ScansFloat, IndexScansReportTheFirstOfEquals)
     EXPECT_TRUE(SameBitsArray(std::vector<float>{1.0f, -0.0f, 2.0f, 1.0f}, std::vector<float>(v, v + 4)));
 }
 
-// The paired scan written out step by step: pairs from `start`, the smaller
-// of a pair against the minimum, the larger against the maximum with the
-// inverted test, a last single element on its own.
+// The paired scan: the smaller of each pair against the minimum, the larger
+// against the maximum with the inverted test, a last single element alone.
 struct Pair {
     std::size_t lo;
     std::size_t hi;
@@ -294,9 +286,6 @@ TYPED_TEST(Reductions, ScansMatchTheLoopsWrittenOut)
     }
 }
 
-// ---------------------------------------------------------------------------
-// Element-wise maximum and minimum.
-// ---------------------------------------------------------------------------
 float MaxOf(float first, float second) { return second > first ? second : first; }
 float MinOf(float first, float second) { return first > second ? second : first; }
 

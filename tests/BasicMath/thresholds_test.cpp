@@ -1,6 +1,5 @@
-// Thresholds, Trim and VectorSlope: one strict test per element that lets
-// NaN and equal values through with their own bits, the low side of Trim
-// first, and a ramp computed from the index at each element.
+// Thresholds and Trim: one strict test per element, which NaN and equal
+// values pass with their own bits; VectorSlope from the index.
 
 #include <kestaccel/BasicMath.h>
 
@@ -79,9 +78,8 @@ std::vector<T> LevelRichReals(std::size_t count, std::uint32_t seed, T level)
     return values;
 }
 
-// The (level, value) pairs put the value on either side of the level, a NaN
-// value (stored as given), a -0 level among +0 and -0, and a NaN level; for
-// Trim they are (low, high), the first with low above high.
+// Values either side of the level, a NaN value, a -0 and a NaN level; for
+// Trim (low, high), the first with low above high.
 TYPED_TEST(Thresholds, MatchTheScalarRuleOnRandomAndOverlappingData)
 {
     using T = TypeParam;
@@ -116,11 +114,8 @@ TEST(TrimFloat, LowIsTestedFirstAndNaNPasses)
     EXPECT_TRUE(SameBitsArray({-1, 5}, trim({-5, 5}, -1.0f, nan)));
 }
 
-// ---------------------------------------------------------------------------
-// VectorSlope.
-// ---------------------------------------------------------------------------
-// T(i) * slope + offset with two roundings, never a running sum; the data
-// must tell both a running sum and a fused step apart.
+// T(i) * slope + offset, two roundings; the data must tell a running sum and a
+// fused step apart.
 TYPED_TEST(Thresholds, VectorSlopeComputesEachElementFromItsIndex)
 {
     using T = TypeParam;

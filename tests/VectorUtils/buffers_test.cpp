@@ -36,10 +36,6 @@ static_assert(kGap<HasEqual, unsigned char, float> && !HasEqual<short>::value &&
 static_assert(kGap<HasFree, cf, int> && HasFree<short>::value && !HasFree<unsigned int>::value &&
                   !HasFree<signed char>::value, "no Free of int, unsigned int or signed char");
 
-// ---------------------------------------------------------------------------
-// Allocation.
-// ---------------------------------------------------------------------------
-
 // The complex forms zero their elements even in memory that held data: dirty
 // a block, release it, and ask again for the same size.
 template <class C, class Alloc>
@@ -77,9 +73,6 @@ TEST(Malloc, AllocationAndRelease)
     ExpectZeroedComplexAllocation<cd>(ku::Malloc_Complex_Double);
 }
 
-// ---------------------------------------------------------------------------
-// Copy, Move, Zero, Set over every element type, each where it exists.
-// ---------------------------------------------------------------------------
 template <class T>
 std::vector<T> Pattern(std::size_t n, int salt)
 {
@@ -93,9 +86,8 @@ class BlockOps : public ::testing::Test {};
 using ElementTypes = ::testing::Types<unsigned char, signed char, short, int, unsigned int, float, double>;
 TYPED_TEST_SUITE(BlockOps, ElementTypes);
 
-// Exactly count elements written on every size, null pointers for count 0,
-// Move on overlap in both directions, and Set's two paths: a value equal to
-// zero clears (-0.0 stores +0.0), any other is stored bits and all.
+// Every member where it exists; Set clears for a value equal to zero (-0.0
+// stores +0.0) and stores any other bits and all.
 TYPED_TEST(BlockOps, WriteExactlyCountElements)
 {
     using T = TypeParam;
@@ -150,11 +142,8 @@ TYPED_TEST(BlockOps, WriteExactlyCountElements)
     }
 }
 
-// ---------------------------------------------------------------------------
-// The 32-bit byte count: a count whose byte count wraps to 0 must not touch
-// these small buffers, and one that wraps to 4 bytes touches one float. Set's
-// zero path (0 and -0) wraps as Zero does.
-// ---------------------------------------------------------------------------
+// The 32-bit byte count wraps: to 0 bytes (these small buffers stay untouched)
+// or to 4; Set's zero path wraps as Zero does.
 TEST(ByteCount, CopyMoveZeroAndSetOfZeroWrapAtFourGibibytes)
 {
     constexpr unsigned int kWrapsToZero = 1u << 30, kWrapsToOne = kWrapsToZero + 1u;

@@ -21,9 +21,8 @@ class SwapBytesTest : public ::testing::Test {};
 using WordTypes = ::testing::Types<unsigned short, unsigned int, unsigned long long, int24_t>;
 TYPED_TEST_SUITE(SwapBytesTest, WordTypes);
 
-// Both forms, count 0 included; twice gives the data back; src == dst is the
-// in-place form; and a destination one word ahead of the source reads back
-// what the previous step wrote.
+// Both forms; twice gives the data back; src == dst is the in-place form; dst
+// one word ahead of src reads back what the previous step wrote.
 TYPED_TEST(SwapBytesTest, MatchesByteReversal)
 {
     using Word = TypeParam;

@@ -1,7 +1,5 @@
-// Convert: hand-worked limits, wraps, saturation and the indefinite value,
-// then every overload against a plain loop around pow, powf, lroundf and
-// lround on seeded data with halves, huge values, NaN and infinities, under
-// every rounding mode and on overlapping buffers.
+// Convert: limits, wraps, saturation and the indefinite value by hand, then
+// every overload against a plain loop, under every rounding mode.
 
 #include <kestaccel/VectorUtils.h>
 
@@ -155,10 +153,6 @@ std::vector<Src> RandomIntegers(std::size_t count, std::uint32_t seed)
     return values;
 }
 
-// ---------------------------------------------------------------------------
-// Hand-worked values.
-// ---------------------------------------------------------------------------
-
 // Float sources to every integer destination (both rounding flags unless
 // `round` is 0 or 1), and the same source as a double to int.
 TEST(ConvertHandWorked, FloatToIntegerTable)
@@ -194,9 +188,8 @@ TEST(ConvertHandWorked, FloatToIntegerTable)
     }
 }
 
-// Double to int keeps the float m for limited elements and multiplies the
-// others in double: 0.1 * 2^31 is 214748364.8 in double, while the float
-// 0.1f * 2^31 would give 214748368. At scale 1, lroundf(+-0.5f) is +-1.
+// Limited elements take the float m, the others multiply in double: 0.1 * 2^31
+// gives 214748364, 0.1f * 2^31 would give 214748368.
 TEST(ConvertHandWorked, DoubleToIntMixesFloatLimitAndDoubleProduct)
 {
     const struct { double x; int scale; bool round; long long expected; } rows[] = {
@@ -207,9 +200,8 @@ TEST(ConvertHandWorked, DoubleToIntMixesFloatLimitAndDoubleProduct)
         EXPECT_EQ(Ints(37, r.expected), Copies<int>(r.x, r.scale, r.round)) << r.x << " scale " << r.scale;
 }
 
-// Each value from every integer source that holds it. The float multiplier is
-// the double 2^-scale narrowed: 2^-150 becomes 0, so 3 * m is +0 where a
-// product narrowed afterwards would give 2^-148; a negative scale multiplies.
+// The float multiplier is the narrowed double 2^-scale: 2^-150 becomes 0, so
+// 3 * m is +0, not 2^-148.
 TEST(ConvertHandWorked, IntegerToRealTable)
 {
     const struct { int v, scale; float f; double d; } rows[] = {
@@ -242,10 +234,6 @@ TEST(ConvertHandWorked, PackedAndWidth)
     // Sign extension of bit 23 (bytes FF FF FF, FF FF 7F, 00 00 80), no shift.
     EXPECT_EQ((std::vector<int>{-1, 8388607, -8388608}), (Converted<int24_t, int>({-1, 8388607, -8388608})));
 }
-
-// ---------------------------------------------------------------------------
-// Every overload against the plain loop, count 0 included.
-// ---------------------------------------------------------------------------
 
 template <class Dst, class Src, class Ref, class... Args>
 ::testing::AssertionResult MatchesLoop(const std::vector<Src>& src, Ref ref, Args... args)
@@ -286,9 +274,8 @@ void CheckToReal(std::uint32_t seedBase)
     }
 }
 
-// The scaled overloads, those without a scale, int to packed (a floor division
-// by 2^(scale & 31), then saturation), and float bit patterns with an odd
-// stride (every exponent, both signs, NaNs) through the unscaled int path.
+// Every overload; int to packed is a floor division by 2^(scale & 31), then
+// saturation; float bit patterns of every exponent through the unscaled path.
 void CheckEveryOverload()
 {
     CheckFromReal<float, unsigned char>(1000);
@@ -336,10 +323,8 @@ TEST(ConvertDifferential, EveryOverloadMatchesPlainLoopInEveryRoundingMode)
     }
 }
 
-// Source and destination on one buffer, the destination `offset` bytes in,
-// against the ascending element loop run here on `bytes`. Packing in place
-// (as audio code does to save a copy) writes behind the reads to come, or
-// ahead of them with an offset; a blocked fast path would read too early.
+// One buffer, dst `offset` bytes in, against the ascending loop run on `bytes`:
+// a blocked fast path would read too early.
 template <class Src, class Dst, class Ref, class... Args>
 ::testing::AssertionResult InPlaceMatchesLoop(std::vector<unsigned char>& bytes, std::size_t offset, Ref ref,
                                               Args... args)

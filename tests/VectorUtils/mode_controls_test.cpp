@@ -23,9 +23,8 @@ const ModeControl kControls[] = {
     {"DenormalExceptionsEnabled", GetDenormalExceptionsEnabled, SetDenormalExceptionsEnabled},
 };
 
-// Every Get answers false whatever was set, and no Set reaches the
-// processor's control register, where it would flush a denormal sum to zero
-// (compared as bits: such a register would flush a comparison too).
+// Gets answer false and no Set reaches the processor; bits are compared, since
+// a flush-to-zero mode would flush a comparison too.
 TEST(ModeControls, GetsAnswerFalseAndSetsChangeNothing)
 {
     using kestaccel_test::FromBits;
