@@ -20,12 +20,11 @@ using namespace kestaccel_test;
 KESTACCEL_PROBE(HasAddConstantProduct, ku::AddConstantProduct(0u, Arg<const T*>(), Arg<T*>(), Arg<T>()))
 KESTACCEL_PROBE(HasDivConstantRev, ku::DivConstantRev(0u, Arg<T>(), Arg<const T*>(), Arg<T*>()))
 KESTACCEL_PROBE(HasShortScaledMul, ku::MulConstant_InPlace(0u, Arg<T*>(), Arg<T>(), 0))
-static_assert(HasAddConstantProduct<double>::value && !HasAddConstantProduct<std::complex<float>>::value &&
-                  !HasAddConstantProduct<std::complex<double>>::value, "no complex AddConstantProduct");
-static_assert(HasDivConstantRev<float>::value && !HasDivConstantRev<std::complex<float>>::value &&
-                  !HasDivConstantRev<std::complex<double>>::value, "no complex DivConstantRev");
-static_assert(HasShortScaledMul<short>::value && !HasShortScaledMul<std::complex<float>>::value,
-              "no scaled complex MulConstant_InPlace");
+using CF = std::complex<float>;
+using CD = std::complex<double>;
+static_assert(kGap<HasAddConstantProduct, double, CF> && !HasAddConstantProduct<CD>::value, "no complex form");
+static_assert(kGap<HasDivConstantRev, float, CF> && !HasDivConstantRev<CD>::value, "no complex form");
+static_assert(kGap<HasShortScaledMul, short, CF>, "no scaled complex MulConstant_InPlace");
 
 // Four rounded products, then one rounded difference and one rounded sum.
 template <class T>
