@@ -2,7 +2,6 @@
 // short multiply.
 
 #include <kestaccel/BasicMath.h>
-#include <kestaccel/VectorUtils.h>
 
 #include <cmath>
 #include <limits>
