@@ -323,6 +323,20 @@ TEST(ConvertDifferential, EveryOverloadMatchesPlainLoopInEveryRoundingMode)
     }
 }
 
+// Every short, and random 24-bit words, through the unit float range and back.
+TEST(ConvertRoundTrip, ShortAndPackedThroughFloatAreExact)
+{
+    std::vector<short> all(65536);
+    for (int i = 0; i < 65536; ++i) all[i] = static_cast<short>(i - 32768);
+    const auto unit = Converted<short, float>(all, 15);
+    const auto packed = RandomIntegers<int24_t>(4099, 4000);
+    const auto packedUnit = Converted<int24_t, float>(packed, 23);
+    for (bool round : {false, true}) {
+        EXPECT_TRUE(Same(all, (Converted<float, short>(unit, -15, round)))) << "round " << round;
+        EXPECT_TRUE(Same(packed, (Converted<float, int24_t>(packedUnit, -23, round)))) << "round " << round;
+    }
+}
+
 // One buffer, dst `offset` bytes in, against the ascending loop run on `bytes`:
 // a blocked fast path would read too early.
 template <class Src, class Dst, class Ref, class... Args>
