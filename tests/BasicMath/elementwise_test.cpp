@@ -1,8 +1,5 @@
-// Elementwise functions: each float member against the single-precision
-// runtime function called here (a widened double call differs in the last
-// bit on some of these inputs), the two sign rules of Abs and Abs_InPlace,
-// Flip against Flip_InPlace, the overflow of CartToPolar against Magnitude,
-// Normalize without a zero test, and both inverted thresholds.
+// Elementwise functions: the float members call the single-precision runtime
+// (a widened call differs in the last bit), and the odd rules of Abs and Flip.
 
 #include <kestaccel/BasicMath.h>
 
@@ -28,36 +25,26 @@ namespace {
 namespace ku = kestaccel::utility;
 using namespace kestaccel_test;
 
-// Gaps that stay gaps. Each detector is first shown to see the member that
-// does exist, so that a false answer means something.
-#define DETECTOR(Name, Call) template <class T, class = void> struct Name : std::false_type {}; \
-    template <class T> struct Name<T, std::void_t<decltype(Call)>> : std::true_type {};
-DETECTOR(HasLnInPlace, ku::Ln_InPlace(0u, std::declval<T*>()))
-DETECTOR(HasPowPrec26, ku::Pow_Prec26(0u, std::declval<const T*>(), std::declval<const T*>(), std::declval<T*>()))
-DETECTOR(HasInversePrec26, ku::Inverse_Prec26(0u, std::declval<const T*>(), std::declval<T*>()))
-DETECTOR(HasLnPrec11, ku::Ln_Prec11(0u, std::declval<const T*>(), std::declval<T*>()))
-DETECTOR(HasCartToPolar, ku::CartToPolar(0u, std::declval<const T*>(), std::declval<T*>(), std::declval<T*>()))
-DETECTOR(HasPolarToCart, ku::PolarToCart(0u, std::declval<const T*>(), std::declval<const T*>(), std::declval<T*>()))
-// Magnitude of a complex vector exists; of an interleaved real buffer it does
-// not. The complex threshold is a real scalar. (T is a pair of argument types.)
-DETECTOR(HasMagnitudeOf, ku::Magnitude(0u, std::declval<const typename T::first_type*>(), std::declval<typename T::second_type*>()))
-DETECTOR(HasInvertThreshold,
-         ku::Invert_Threshold_InPlace(0u, std::declval<typename T::first_type*>(), std::declval<typename T::second_type>()))
-#undef DETECTOR
-static_assert(HasLnInPlace<float>::value && !HasLnInPlace<double>::value && HasLnPrec11<float>::value &&
-                  !HasLnPrec11<double>::value, "Ln_InPlace and Ln_Prec11 are float only");
-static_assert(HasPowPrec26<double>::value && !HasPowPrec26<float>::value && HasInversePrec26<double>::value &&
-                  !HasInversePrec26<float>::value, "Pow_Prec26 and Inverse_Prec26 are double only");
-static_assert(HasCartToPolar<float>::value && !HasCartToPolar<double>::value && HasPolarToCart<float>::value &&
-                  !HasPolarToCart<double>::value, "CartToPolar and PolarToCart are float only");
-template <class S, class D>
-using Args = std::pair<S, D>;
-static_assert(HasMagnitudeOf<Args<std::complex<float>, float>>::value && !HasMagnitudeOf<Args<float, float>>::value &&
-                  HasMagnitudeOf<Args<std::complex<double>, double>>::value && !HasMagnitudeOf<Args<double, double>>::value,
+// Gaps that stay gaps; each probe first sees the member that does exist.
+KESTACCEL_PROBE(HasLnInPlace, ku::Ln_InPlace(0u, Arg<T*>()))
+KESTACCEL_PROBE(HasPowPrec26, ku::Pow_Prec26(0u, Arg<const T*>(), Arg<const T*>(), Arg<T*>()))
+KESTACCEL_PROBE(HasInversePrec26, ku::Inverse_Prec26(0u, Arg<const T*>(), Arg<T*>()))
+KESTACCEL_PROBE(HasLnPrec11, ku::Ln_Prec11(0u, Arg<const T*>(), Arg<T*>()))
+KESTACCEL_PROBE(HasCartToPolar, ku::CartToPolar(0u, Arg<const T*>(), Arg<T*>(), Arg<T*>()))
+KESTACCEL_PROBE(HasPolarToCart, ku::PolarToCart(0u, Arg<const T*>(), Arg<const T*>(), Arg<T*>()))
+// T is a pair of argument types: no Magnitude of an interleaved real buffer,
+// and the complex threshold is a real scalar.
+KESTACCEL_PROBE(HasMagnitudeOf, ku::Magnitude(0u, Arg<const typename T::first_type*>(), Arg<typename T::second_type*>()))
+KESTACCEL_PROBE(HasInvertThreshold,
+                ku::Invert_Threshold_InPlace(0u, Arg<typename T::first_type*>(), Arg<typename T::second_type>()))
+using CF = std::complex<float>;
+static_assert(kGap<HasLnInPlace, float, double> && kGap<HasLnPrec11, float, double>, "float only");
+static_assert(kGap<HasPowPrec26, double, float> && kGap<HasInversePrec26, double, float>, "double only");
+static_assert(kGap<HasCartToPolar, float, double> && kGap<HasPolarToCart, float, double>, "float only");
+static_assert(kGap<HasMagnitudeOf, std::pair<CF, float>, std::pair<float, float>> &&
+                  kGap<HasMagnitudeOf, std::pair<std::complex<double>, double>, std::pair<double, double>>,
               "no Magnitude of an interleaved real buffer");
-static_assert(HasInvertThreshold<Args<std::complex<float>, float>>::value &&
-                  !HasInvertThreshold<Args<std::complex<float>, std::complex<float>>>::value,
-              "the complex threshold is real");
+static_assert(kGap<HasInvertThreshold, std::pair<CF, float>, std::pair<CF, CF>>, "the complex threshold is real");
 
 // The runtime in each precision, called from the test itself.
 template <class T>
@@ -75,12 +62,6 @@ struct Runtime {
 #endif
 };
 
-template <class T>
-T NegativeNaN()
-{
-    return FromBits<T>(sizeof(T) == 4 ? BitsType<T>(0xFFC00123u) : BitsType<T>(0xFFF8000000000123ull));
-}
-
 // What Abs_InPlace does: the sign bit cleared, whatever the value.
 template <class T>
 T ClearSign(T x)
@@ -93,7 +74,7 @@ template <class T>
 std::vector<T> WithSpecials(std::vector<T> values)
 {
     const T inf = std::numeric_limits<T>::infinity();
-    const T specials[] = {T(0), -T(0), inf, -inf, std::numeric_limits<T>::quiet_NaN(), NegativeNaN<T>(),
+    const T specials[] = {T(0), -T(0), inf, -inf, std::numeric_limits<T>::quiet_NaN(), -QuietNaN<T>(0x123),
                           std::numeric_limits<T>::denorm_min(), T(-1), T(1), T(0.5), T(-2.5)};
     for (std::size_t k = 0; k < sizeof specials / sizeof specials[0] && k < values.size(); ++k)
         values[(k * 37) % values.size()] = specials[k];
@@ -105,59 +86,20 @@ class Elementwise : public ::testing::Test {};
 using FloatingTypes = ::testing::Types<float, double>;
 TYPED_TEST_SUITE(Elementwise, FloatingTypes);
 
-constexpr unsigned int kRuntimeSamples = 4000;
+constexpr unsigned int kRuntimeSamples = 16000;
 
 // A member of the library as a callable whose element type picks the overload.
 #define MEMBER(f) [](auto... a) -> decltype(ku::f(a...)) { ku::f(a...); }
 
-// out[i] against ref(in[i]) (or ref(in[i], i)) bit for bit, with the sentinel
-// and count 0 writing nothing; `member` takes (count, src, dst) or, run on a
-// copy of the input, (count, srcDst). Where it reads and writes one type, dst
-// one element ahead of src reads at each index the value written at the one
-// before, and one element behind reads nothing twice: the plain ascending
-// loop, which a vectorised body must not change.
-template <class E, class Ref, class Member>
-void ExpectMatches(const std::vector<E>& in, Ref ref, Member member)
-{
-    const auto at = [&ref](E x, std::size_t i) {
-        if constexpr (std::is_invocable<Ref, E, std::size_t>::value) return ref(x, i);
-        else return ref(x);
-    };
-    using D = decltype(at(E(), 0));
-    constexpr bool inPlace = std::is_invocable<Member, unsigned int, E*>::value;
-    const auto n = static_cast<unsigned int>(in.size());
-    GuardedBuffer<D> out(n), none(0);
-    if constexpr (inPlace) {
-        std::copy(in.begin(), in.end(), out.data());
-        member(n, out.data());
-        member(0u, none.data());
-    } else {
-        member(n, in.data(), out.data());
-        member(0u, static_cast<const E*>(nullptr), none.data());
-    }
-    for (std::size_t i = 0; i < n; ++i) ASSERT_TRUE(SameBits(at(in[i], i), out[i])) << "at index " << i << " of " << n;
-    EXPECT_TRUE(out.Intact() && none.Intact());
-    if constexpr (!inPlace && std::is_same<D, E>::value) {
-        for (const std::size_t ahead : {1, 0}) {
-            std::vector<E> buffer(in);
-            buffer.push_back(E(0.75));
-            auto chained = buffer;
-            for (std::size_t i = 0; i < n; ++i) chained[i + ahead] = at(chained[i + 1 - ahead], i);
-            member(n, buffer.data() + 1 - ahead, buffer.data() + ahead);
-            EXPECT_TRUE(SameBitsArray(chained, buffer)) << (ahead ? "dst one element ahead" : "dst one element behind");
-        }
-    }
-}
-
-// The members that call the runtime, on a few thousand inputs each: the float
-// ones must give the bits of the float function, not of a widened call.
+// The members that call the runtime: the float ones must give the bits of the
+// float function, not of a widened call, which the finite results tell apart.
 TYPED_TEST(Elementwise, RuntimeFunctionsOfTheirPrecision)
 {
     using T = TypeParam;
     using R = Runtime<T>;
     const std::uint32_t seed = 1100;
     SCOPED_TRACE(SeedTrace(seed));
-    const auto exponents = WithSpecials(RandomReals<T>(kRuntimeSamples, seed, T(-100), T(100)));
+    const auto exponents = WithSpecials(RandomReals<T>(kRuntimeSamples, seed, T(-87), T(88)));
     ExpectMatches(exponents, R::Exp, MEMBER(Exp));
     ExpectMatches(exponents, R::Exp, MEMBER(Exp_InPlace));
     ExpectMatches(exponents, R::Round, MEMBER(Round));
@@ -226,17 +168,13 @@ TYPED_TEST(Elementwise, PlainPassesOverEverySize)
             ASSERT_TRUE(SameBits(expected, reinterpret_cast<const T*>(z.data())[j])) << "PowerSpectr over its source at " << j;
         }
 
-        // Flip copies forward, Flip_InPlace swaps; one element ahead of its
-        // source Flip reads back what it wrote, as the forward loop does.
-        const std::vector<T> reversed(in.rbegin(), in.rend());
-        GuardedBuffer<T> dst(n), srcDst(n), none(0);
-        std::copy(in.begin(), in.end(), srcDst.data());
+        // Flip_InPlace reverses; Flip is a forward copy, so one element ahead
+        // of its source it reads back what it wrote.
+        ExpectMatches(in, [&in](T, std::size_t i) { return in[in.size() - 1 - i]; }, MEMBER(Flip_InPlace));
+        GuardedBuffer<T> dst(n), none(0);
         ku::Flip(n, in.data(), dst.data());
-        ku::Flip_InPlace(n, srcDst.data());
         ku::Flip(0, in.data(), none.data());
-        ku::Flip_InPlace(0, none.data());
-        EXPECT_TRUE(SameBitsArray(reversed.data(), dst.data(), n) && SameBitsArray(reversed.data(), srcDst.data(), n));
-        EXPECT_TRUE(dst.Intact() && srcDst.Intact() && none.Intact());
+        EXPECT_TRUE(SameBitsArray(std::vector<T>(in.rbegin(), in.rend()), dst.values()) && dst.Intact() && none.Intact());
         std::vector<T> ahead = in;
         ahead.push_back(T(0.75));
         auto aheadExpected = ahead;
@@ -253,8 +191,6 @@ TYPED_TEST(Elementwise, HandWorkedValues)
     T out = 0;
     ku::Pow(1, &two, &ten, &out);
     EXPECT_TRUE(SameBits(T(1024), out)) << "the first vector is the base";
-    ku::Normalize(1, &five, &out, T(1), T(2));
-    EXPECT_TRUE(SameBits(T(2), out));
     ku::Normalize(1, &five, &out, T(0), T(0));
     EXPECT_TRUE(SameBits(std::numeric_limits<T>::infinity(), out)) << "no zero test on the divisor";
 
@@ -265,32 +201,29 @@ TYPED_TEST(Elementwise, HandWorkedValues)
     EXPECT_TRUE(SameBitsArray(std::vector<T>{T(2), T(3), T(-2), T(-3), T(1), -T(0)}, rounded));
 
     // The two sign rules part on -0 and on a NaN with its sign bit set.
-    const std::vector<T> odd = {-T(0), NegativeNaN<T>(), T(-3)};
+    const T negativeNaN = -QuietNaN<T>(0x123);
+    const std::vector<T> odd = {-T(0), negativeNaN, T(-3)};
     std::vector<T> abs(3), absInPlace = odd;
     ku::Abs(3, odd.data(), abs.data());
     ku::Abs_InPlace(3, absInPlace.data());
-    EXPECT_TRUE(SameBitsArray(std::vector<T>{-T(0), NegativeNaN<T>(), T(3)}, abs));
-    EXPECT_TRUE(SameBitsArray(std::vector<T>{T(0), ClearSign(NegativeNaN<T>()), T(3)}, absInPlace));
+    EXPECT_TRUE(SameBitsArray(std::vector<T>{-T(0), negativeNaN, T(3)}, abs));
+    EXPECT_TRUE(SameBitsArray(std::vector<T>{T(0), ClearSign(negativeNaN), T(3)}, absInPlace));
 
     // Flip onto its own source ends as a palindrome of its last half.
-    std::vector<T> four = {1, 2, 3, 4}, three = {1, 2, 3}, twoItems = {1, 2}, one = {7};
+    std::vector<T> four = {1, 2, 3, 4};
     ku::Flip(4, four.data(), four.data());
-    ku::Flip_InPlace(3, three.data());
-    ku::Flip_InPlace(2, twoItems.data());
-    ku::Flip_InPlace(1, one.data());
     EXPECT_TRUE(SameBitsArray(std::vector<T>{4, 3, 3, 4}, four));
-    EXPECT_TRUE(SameBitsArray(std::vector<T>{3, 2, 1}, three) && SameBitsArray(std::vector<T>{2, 1}, twoItems) &&
-                SameBitsArray(std::vector<T>{7}, one));
 }
 
-// CartToPolar sums the squares in float and takes sqrtf and atan2f; PolarToCart
-// multiplies cosf and sinf by the magnitude.
+// CartToPolar: sqrtf of squares summed in float (3e19 overflows), atan2f;
+// PolarToCart: cosf and sinf times the magnitude.
 TEST(ElementwiseFloat, PolarConversionsUseTheFloatRuntime)
 {
     const std::uint32_t seed = 1900;
     SCOPED_TRACE(SeedTrace(seed));
     const unsigned int n = kRuntimeSamples;
-    const auto src = WithSpecials(RandomReals<float>(2 * n, seed, -50.0f, 50.0f));
+    auto src = WithSpecials(RandomReals<float>(2 * n, seed, -50.0f, 50.0f));
+    src[100] = 3e19f;
     const auto radius = RandomReals<float>(n, seed + 1, 0.0f, 100.0f);
     const auto angle = WithSpecials(RandomReals<float>(n, seed + 2, -1e4f, 1e4f));
     GuardedBuffer<float> magnitude(n), phase(n), cart(2 * n), none(0);
@@ -306,26 +239,16 @@ TEST(ElementwiseFloat, PolarConversionsUseTheFloatRuntime)
         ASSERT_TRUE(SameBits(::sinf(angle[i]) * radius[i], cart[2 * i + 1])) << "index " << i;
     }
     EXPECT_TRUE(magnitude.Intact() && phase.Intact() && cart.Intact() && none.Intact());
-
-    // (0, 1), (-1, 0) and a pair whose squares overflow single precision,
-    // which Magnitude survives.
-    const float pairs[] = {0.0f, 1.0f, -1.0f, 0.0f, 3e19f, 0.0f};
-    const float pi = 3.14159265358979323846f, magnitudes[] = {1.0f, 1.0f, std::numeric_limits<float>::infinity()};
-    float m[3], p[3], hyp = 0;
-    ku::CartToPolar(3, pairs, m, p);
-    ku::Magnitude(1, &pairs[4], &pairs[5], &hyp);
-    EXPECT_TRUE(SameBitsArray(magnitudes, m, 3));
-    EXPECT_TRUE(SameBits(pi / 2, p[0]) && SameBits(pi, p[1]));
-    EXPECT_TRUE(SameBits(3e19f, hyp));
+    EXPECT_TRUE(SameBits(std::numeric_limits<float>::infinity(), magnitude[50]));
 }
 
-// Both thresholds written out from their definitions. The real one tests the
-// size of x, but at or below epsilon x itself; the complex one tests the
-// squared magnitude (widened to double for float), keeping the phase.
+// Both thresholds written out. The real one tests the size of x, but at or
+// below epsilon x itself; the complex one the squared size, in double.
 template <class T>
 T InvertedWithThreshold(T x, T threshold)
 {
     const T eps = std::numeric_limits<T>::epsilon();
+    if (T(0) >= threshold) return x;
     if (threshold <= eps) return x <= eps ? std::numeric_limits<T>::infinity() : T(1) / x;
     const T s = std::fabs(x);
     if (s >= threshold) return T(1) / x;
@@ -337,52 +260,35 @@ template <class T>
 std::complex<T> InvertedWithThreshold(std::complex<T> z, T threshold)
 {
     const T re = z.real(), im = z.imag(), p = im * im + re * re;
+    if (T(0) >= threshold) return z;
     if (static_cast<double>(p) <= static_cast<double>(std::numeric_limits<T>::epsilon())) return {T(1) / threshold, T(0)};
     const T m = threshold * threshold > p ? std::sqrt(p) * threshold : p;
     return {re / m, -im / m};
 }
 
+// By hand: a tiny threshold sends negatives to +infinity, a NaN threshold
+// passes the early test (its NaN's sign is not fixed), and tiny complex elements.
 TYPED_TEST(Elementwise, InvertThreshold)
 {
     using T = TypeParam;
     using Z = std::complex<T>;
-    const T inf = std::numeric_limits<T>::infinity(), nan = std::numeric_limits<T>::quiet_NaN();
-    const std::vector<T> hand = {2, T(0.25), T(-0.25), 0, -2};
-    std::vector<T> out = hand, tiny = {-3, 0, 2}, unlimited = hand;
-    ku::Invert_Threshold_InPlace(5, out.data(), T(0.5));
-    EXPECT_TRUE(SameBitsArray(std::vector<T>{T(0.5), 2, -2, 2, T(-0.5)}, out));
+    const T inf = std::numeric_limits<T>::infinity(), eps = std::numeric_limits<T>::epsilon();
+    std::vector<T> tiny = {-3, 0, 2};
     ku::Invert_Threshold_InPlace(3, tiny.data(), T(1e-20));
-    EXPECT_TRUE(SameBitsArray(std::vector<T>{inf, inf, T(0.5)}, tiny)) << "negatives go to +infinity";
-    // A NaN threshold passes the early test; no size reaches it, so every
-    // element becomes one of the NaN limits.
-    ku::Invert_Threshold_InPlace(5, unlimited.data(), nan);
-    for (const T x : unlimited) EXPECT_TRUE(std::isnan(x));
-
-    // A tiny complex element in any direction gives (top, +0); a NaN one stays NaN.
-    std::vector<Z> zs = {{T(0.25), 0}, {0, 0}, {2, 0}, {-T(1e-30), -T(1e-30)}, {nan, 1}};
-    ku::Invert_Threshold_InPlace(5, zs.data(), T(0.5));
-    EXPECT_TRUE(SameBitsArray(std::vector<Z>{{2, -T(0)}, {2, T(0)}, {T(0.5), -T(0)}, {2, T(0)}}, std::vector<Z>(zs.begin(), zs.begin() + 4)));
-    EXPECT_TRUE(std::isnan(zs[4].real()) && std::isnan(zs[4].imag()));
-    // With a NaN threshold limit > p fails, so a normal element takes the
-    // unlimited inverse.
+    EXPECT_TRUE(SameBitsArray(std::vector<T>{inf, inf, T(0.5)}, tiny));
+    std::vector<Z> zs = {{T(0.25), 0}, {0, 0}, {-T(1e-30), -T(1e-30)}};
+    ku::Invert_Threshold_InPlace(3, zs.data(), T(0.5));
+    EXPECT_TRUE(SameBitsArray(std::vector<Z>{{2, -T(0)}, {2, T(0)}, {2, T(0)}}, zs));
+    std::vector<T> unlimited = {2, T(0.25), T(-0.25), 0, -2};
     std::vector<Z> zUnlimited = {{2, 0}, {0, 0}};
-    ku::Invert_Threshold_InPlace(2, zUnlimited.data(), nan);
+    ku::Invert_Threshold_InPlace(5, unlimited.data(), QuietNaN<T>());
+    ku::Invert_Threshold_InPlace(2, zUnlimited.data(), QuietNaN<T>());
+    for (const T x : unlimited) EXPECT_TRUE(std::isnan(x));
     EXPECT_TRUE(SameBits(Z(T(0.5), -T(0)), zUnlimited[0]));
     EXPECT_TRUE(std::isnan(zUnlimited[1].real()) && SameBits(T(0), zUnlimited[1].imag()));
 
-    // A zero or negative threshold changes nothing.
-    const auto original = RandomComplex<T>(16, 2090);
-    for (const T threshold : {T(0), -T(0), T(-1)}) {
-        std::vector<T> same = hand;
-        auto zSame = original;
-        ku::Invert_Threshold_InPlace(5, same.data(), threshold);
-        ku::Invert_Threshold_InPlace(16, zSame.data(), threshold);
-        EXPECT_TRUE(SameBitsArray(hand, same) && SameBitsArray(original, zSame)) << threshold;
-    }
-
     std::uint32_t seed = 2000;
-    const T eps = std::numeric_limits<T>::epsilon();
-    for (const T threshold : {T(0.75), T(3), eps, eps / 4, T(2) * eps, T(0.6), T(1e-3), T(7)}) {
+    for (const T threshold : {T(0.75), T(3), eps, eps / 4, T(2) * eps, T(0.6), T(1e-3), T(7), T(0), -T(0), T(-1)}) {
         for (unsigned int n : InterestingSizes()) {
             SCOPED_TRACE(::testing::Message() << "threshold " << threshold << " size " << n << " " << SeedTrace(seed));
             auto in = WithSpecials(RandomReals<T>(n, seed++, T(-4), T(4)));

@@ -1,13 +1,9 @@
-// ConvertFloat2Half and ConvertHalf2Float: the documented table rows both
-// ways bit for bit, the nineteen-value vector, every half word against its
-// value computed with ldexp, random floats against a field formula and a
-// value-based accuracy bound, and count-exact writes.
+// ConvertFloat2Half and ConvertHalf2Float: field-moving packing, bit for bit.
 
 #include <kestaccel/BasicMath.h>
 
 #include <cmath>
 #include <cstdint>
-#include <cstdlib>
 #include <random>
 #include <vector>
 
@@ -56,36 +52,8 @@ TEST(HalfPrecision, TableRows)
     }
 }
 
-// The listed words are within 1 of the truncated words made here and read
-// back within 0.0001; the words made here (truncated, so at most one below)
-// read back within their spacing, 2^-12 under 0.5 and 2^-10 at 1.0. A word
-// before the first and after the last stay as they were.
-TEST(HalfPrecision, NineteenSamples)
-{
-    float samples[] = {0.14476f, 0.12001f, 0.10041f, 1.0f, 0.17767f, 0.12368f, 0.10062f, 1.0f, 0.23952f, 0.13134f,
-                       0.10078f, 1.0f, 0.30731f, 0.13901f, 0.10020f, 1.0f, 0.17767f, 0.12368f, 0.10062f};
-    unsigned short listed[] = {0x30A2, 0x2FAE, 0x2E6D, 0x3C00, 0x31AF, 0x2FEA, 0x2E71, 0x3C00, 0x33AA, 0x3034,
-                               0x2E73, 0x3C00, 0x34EB, 0x3073, 0x2E6A, 0x3C00, 0x31AF, 0x2FEA, 0x2E71};
-    GuardedBuffer<unsigned short> words(20, 0x5A5A);
-    GuardedBuffer<float> back(20, -7.0f), listedBack(19);
-    ku::ConvertFloat2Half(samples, words.data() + 1, 19);
-    ku::ConvertHalf2Float(words.data() + 1, back.data() + 1, 19);
-    ku::ConvertHalf2Float(listed, listedBack.data(), 19);
-    EXPECT_EQ(0x5A5A, words[0]);
-    EXPECT_TRUE(SameBits(-7.0f, back[0]));
-    EXPECT_TRUE(words.Intact() && back.Intact() && listedBack.Intact());
-    for (int i = 0; i < 19; ++i) {
-        SCOPED_TRACE(::testing::Message() << "element " << i);
-        EXPECT_LE(std::abs(static_cast<int>(words[i + 1]) - static_cast<int>(listed[i])), 1);
-        EXPECT_NEAR(samples[i], listedBack[i], 0.0001f);
-        EXPECT_LE(back[i + 1], samples[i]);
-        EXPECT_LT(samples[i] - back[i + 1], samples[i] < 0.5f ? std::ldexp(1.0f, -12) : std::ldexp(1.0f, -10));
-    }
-}
-
-// Every half word against its value: sign * (1 + f/1024) * 2^(E - 15) for
-// every word but 0, whatever E is (0 and 31 included); and back, every word
-// but 0 survives the round trip unchanged.
+// Every word but 0 is sign * (1 + f/1024) * 2^(E - 15), E = 0 and 31 included,
+// and comes back unchanged.
 TEST(HalfPrecision, AllWords)
 {
     std::vector<unsigned short> words(65536);
@@ -103,16 +71,11 @@ TEST(HalfPrecision, AllWords)
     EXPECT_EQ(words, again.values());
 }
 
-// Random floats, count 0 included: half of them bit patterns of every kind,
-// against the fields written with the subtraction form of the exponent wrap;
-// half of them of ordinary magnitude, for which a word of normal half range
-// is the correctly rounded value or the one below it in magnitude, so within
-// one ulp under |x|, with x's sign.
+// Random bit patterns and floats of ordinary size against the fields moved by
+// hand, the exponent wrap written as a subtraction.
 TEST(HalfPrecision, RandomFloatsMatchFieldFormula)
 {
-    std::vector<unsigned int> sizes = InterestingSizes();
-    sizes.push_back(0);
-    for (unsigned int n : sizes) {
+    for (unsigned int n : SizesWithZero()) {
         SCOPED_TRACE(SeedTrace(600 + n));
         std::mt19937 engine(600 + n);
         std::vector<float> src(n + 1, -0.0f);
@@ -122,21 +85,13 @@ TEST(HalfPrecision, RandomFloatsMatchFieldFormula)
             src[i] = i % 2 ? FromBits<float>(u) : scaled;
         }
         GuardedBuffer<unsigned short> dst(n);
-        GuardedBuffer<float> back(n);
         ku::ConvertFloat2Half(src.data(), dst.data(), n);
-        ku::ConvertHalf2Float(dst.data(), back.data(), n);
-        EXPECT_TRUE(dst.Intact() && back.Intact());
+        EXPECT_TRUE(dst.Intact());
         for (std::size_t i = 0; i < n; ++i) {
             const std::uint32_t u = Bits(src[i]);
             const int wrapped = ((static_cast<int>((u >> 23) & 0xFF) - 112) % 32 + 32) % 32;
             const unsigned int expected = u == 0 ? 0u : ((u >> 31) << 15) | (wrapped << 10) | ((u & 0x7FFFFF) >> 13);
             ASSERT_EQ(expected, dst[i]) << std::hex << "float 0x" << u;
-            const float x = std::fabs(src[i]);
-            if (!(x >= std::ldexp(1.0f, -14) && x <= 65504.0f)) continue;
-            int exponent;
-            std::frexp(x, &exponent);
-            ASSERT_TRUE(std::fabs(back[i]) <= x && x - std::fabs(back[i]) < std::ldexp(1.0f, exponent - 11)) << x;
-            ASSERT_EQ(std::signbit(src[i]), std::signbit(back[i])) << x;
         }
     }
     ku::ConvertFloat2Half(nullptr, nullptr, 0);

@@ -1,7 +1,5 @@
-// Interleave and Deinterleave: hand-worked layouts, both forms against plain
-// loops on random data (NaN payloads and -0 included) for one to eight
-// channels, overlapping buffers, which only the frame-outer ascending order
-// gets right, and empty calls.
+// Interleave and Deinterleave against the plain frame-outer loops, values
+// moved bits and all, also on overlapping buffers.
 
 #include <kestaccel/BasicMath.h>
 
@@ -48,38 +46,12 @@ void PlainDeinterleave(unsigned int channels, unsigned int frames, const T* src,
         for (unsigned int c = 0; c < channels; ++c) destinations[c][f] = src[f * channels + c];
 }
 
-TYPED_TEST(LayoutTest, HandWorked)
-{
-    using T = TypeParam;
-    const T a[] = {1, 2}, b[] = {3, 4}, six[] = {1, 2, 3, 4, 5, 6};
-    std::vector<T> pair(4), left(2), right(2), c0(2), c1(2), c2(2), back(6);
-    ku::Interleave(2, a, b, pair.data());
-    ku::Deinterleave(2, pair.data(), left.data(), right.data());
-    EXPECT_EQ((std::vector<T>{1, 3, 2, 4}), pair);
-    EXPECT_EQ((std::vector<T>{1, 2}), left);
-    EXPECT_EQ((std::vector<T>{3, 4}), right);
-
-    T* const planes[] = {c0.data(), c1.data(), c2.data()};
-    const T* const sources[] = {c0.data(), c1.data(), c2.data()};
-    ku::Deinterleave(3, 2, six, planes);
-    ku::Interleave(3, 2, sources, back.data());
-    EXPECT_EQ((std::vector<T>{1, 4}), c0);
-    EXPECT_EQ((std::vector<T>{2, 5}), c1);
-    EXPECT_EQ((std::vector<T>{3, 6}), c2);
-    EXPECT_EQ((std::vector<T>(six, six + 6)), back);
-}
-
-// Both forms at frame counts that reach the vector body and every tail, 0
-// included: random planes interleave as the plain loop does, and that buffer
-// deinterleaves into the planes again. One channel copies; two channels
-// through the N-channel form give the two-buffer form's result.
+// Both ways on every size; two channels also through the two-buffer forms.
 TYPED_TEST(LayoutTest, MatchPlainLoops)
 {
     using T = TypeParam;
-    std::vector<unsigned int> frameCounts = InterestingSizes();
-    frameCounts.push_back(0);
     for (unsigned int channels : {1u, 2u, 3u, 5u, 8u}) {
-        for (unsigned int frames : frameCounts) {
+        for (unsigned int frames : SizesWithZero()) {
             const std::uint32_t seed = 100 * channels + frames;
             SCOPED_TRACE(::testing::Message() << SeedTrace(seed) << " channels " << channels << " frames " << frames);
             std::vector<std::vector<T>> planes(channels);
@@ -114,10 +86,8 @@ TYPED_TEST(LayoutTest, MatchPlainLoops)
     }
 }
 
-// A destination on a source: the interleaved buffer starting on the first
-// channel, and the first channel written over the interleaved source, with two
-// channels in the two-buffer forms and three in the N-channel forms. Only the
-// frame-outer, ascending order gives the plain loop's result.
+// The interleaved buffer over the first channel and the reverse, two channels
+// in the two-buffer forms, three in the N-channel forms.
 TYPED_TEST(LayoutTest, OverlapFollowsAscendingOrder)
 {
     using T = TypeParam;

@@ -1,12 +1,10 @@
-// Thresholds, Trim and VectorSlope: one strict test per element that lets
-// NaN and equal values through with their own bits, the low side of Trim
-// first, and a ramp computed from the index at each element.
+// Thresholds and Trim: one strict test per element, which NaN and equal
+// values pass with their own bits; VectorSlope from the index.
 
 #include <kestaccel/BasicMath.h>
 
 #include <cmath>
-#include <functional>
-#include <tuple>
+#include <random>
 #include <utility>
 
 #include "support/TestSupport.h"
@@ -16,71 +14,31 @@ namespace {
 namespace ku = kestaccel::utility;
 using namespace kestaccel_test;
 
-// Overloads that must not exist: Trim is float only. Each detector first
-// sees the member that does exist.
-template <class T, class = void>
-struct HasTrim : std::false_type {};
-template <class T>
-struct HasTrim<T, std::void_t<decltype(ku::Trim(0u, std::declval<T*>(), std::declval<T>(), std::declval<T>()))>>
-    : std::true_type {};
-template <class T, class = void>
-struct HasThresholdLT : std::false_type {};
-template <class T>
-struct HasThresholdLT<T, std::void_t<decltype(ku::Threshold_LT_InPlace(0u, std::declval<T*>(), std::declval<T>()))>>
-    : std::true_type {};
-static_assert(HasTrim<float>::value && !HasTrim<double>::value, "Trim is float only");
-static_assert(HasThresholdLT<float>::value && HasThresholdLT<double>::value, "");
-static_assert(!HasThresholdLT<std::complex<float>>::value && !HasThresholdLT<std::complex<double>>::value,
-              "no complex thresholds");
+// Gaps that stay gaps: Trim is float only, and nothing is complex.
+KESTACCEL_PROBE(HasTrim, ku::Trim(0u, Arg<T*>(), Arg<T>(), Arg<T>()))
+KESTACCEL_PROBE(HasThresholdLT, ku::Threshold_LT_InPlace(0u, Arg<T*>(), Arg<T>()))
+static_assert(kGap<HasTrim, float, double> && kGap<HasThresholdLT, double, std::complex<double>> &&
+                  kGap<HasThresholdLT, float, std::complex<float>>, "uneven on purpose");
 
-template <class T>
-T QuietNaN(std::uint32_t payload)
+// Each member with (level, value), (low, high) for Trim, and its rule for one
+// element, handed to check(name, rule, member).
+template <class T, class Check>
+void EachMember(T level, T value, Check check)
 {
-    return FromBits<T>(Bits(std::numeric_limits<T>::quiet_NaN()) | payload);
-}
-
-// Count 0 first: it must write nothing past the (empty) destination.
-std::vector<unsigned int> SizesFromZero()
-{
-    std::vector<unsigned int> sizes = kestaccel_test::InterestingSizes();
-    sizes.insert(sizes.begin(), 0u);
-    return sizes;
-}
-
-// Each member with its definition written out as the scalar rule for one
-// element, (level, value) being (low, high) for Trim. In-place members run
-// on a copy of the source in dst.
-template <class T>
-struct ThresholdCase {
-    std::string name;
-    bool inPlace;
-    std::function<void(unsigned int n, T* dst, const T* src, T level, T value)> run;
-    std::function<T(T x, T level, T value)> rule;
-};
-
-template <class T>
-std::vector<ThresholdCase<T>> ThresholdCases()
-{
-    std::vector<ThresholdCase<T>> cases = {
-        {"Threshold_LT_InPlace", true, [](auto n, T* d, const T*, T l, T) { ku::Threshold_LT_InPlace(n, d, l); },
-         [](T x, T level, T) { return level > x ? level : x; }},
-        {"Threshold_GT_InPlace", true, [](auto n, T* d, const T*, T l, T) { ku::Threshold_GT_InPlace(n, d, l); },
-         [](T x, T level, T) { return level < x ? level : x; }},
-        {"Threshold_LTVal", false, [](auto n, T* d, const T* s, T l, T v) { ku::Threshold_LTVal(n, s, d, l, v); },
-         [](T x, T level, T value) { return level > x ? value : x; }},
-        {"Threshold_LTVal_InPlace", true,
-         [](auto n, T* d, const T*, T l, T v) { ku::Threshold_LTVal_InPlace(n, d, l, v); },
-         [](T x, T level, T value) { return level > x ? value : x; }},
-        {"Threshold_GTVal", false, [](auto n, T* d, const T* s, T l, T v) { ku::Threshold_GTVal(n, s, d, l, v); },
-         [](T x, T level, T value) { return x > level ? value : x; }},
-        {"Threshold_GTVal_InPlace", true,
-         [](auto n, T* d, const T*, T l, T v) { ku::Threshold_GTVal_InPlace(n, d, l, v); },
-         [](T x, T level, T value) { return x > level ? value : x; }},
-    };
-    if constexpr (std::is_same<T, float>::value)
-        cases.push_back({"Trim", true, [](auto n, T* d, const T*, T low, T high) { ku::Trim(n, d, low, high); },
-                         [](T x, T low, T high) { return low > x ? low : (high < x ? high : x); }});
-    return cases;
+    using U = unsigned int;
+    const auto lt = [=](T x) { return level > x ? value : x; };
+    const auto gt = [=](T x) { return x > level ? value : x; };
+    check("Threshold_LT_InPlace", [=](T x) { return level > x ? level : x; },
+          [=](U n, T* io) { ku::Threshold_LT_InPlace(n, io, level); });
+    check("Threshold_GT_InPlace", [=](T x) { return level < x ? level : x; },
+          [=](U n, T* io) { ku::Threshold_GT_InPlace(n, io, level); });
+    check("Threshold_LTVal", lt, [=](U n, const T* s, T* d) { ku::Threshold_LTVal(n, s, d, level, value); });
+    check("Threshold_LTVal_InPlace", lt, [=](U n, T* io) { ku::Threshold_LTVal_InPlace(n, io, level, value); });
+    check("Threshold_GTVal", gt, [=](U n, const T* s, T* d) { ku::Threshold_GTVal(n, s, d, level, value); });
+    check("Threshold_GTVal_InPlace", gt, [=](U n, T* io) { ku::Threshold_GTVal_InPlace(n, io, level, value); });
+    if constexpr (HasTrim<T>::value)
+        check("Trim", [=](T x) { return level > x ? level : (value < x ? value : x); },
+              [=](U n, T* io) { ku::Trim(n, io, level, value); });
 }
 
 template <class T>
@@ -88,45 +46,26 @@ class Thresholds : public ::testing::Test {};
 using FloatingTypes = ::testing::Types<float, double>;
 TYPED_TEST_SUITE(Thresholds, FloatingTypes);
 
-template <class T>
-std::vector<T> RunCase(const ThresholdCase<T>& c, const std::vector<T>& src, T level, T value)
-{
-    // An out-of-place member must write every element, so dst starts as a NaN.
-    GuardedBuffer<T> dst(src.size(), QuietNaN<T>(0x7E));
-    for (std::size_t i = 0; c.inPlace && i < src.size(); ++i) dst[i] = src[i];
-    c.run(static_cast<unsigned int>(src.size()), dst.data(), src.data(), level, value);
-    EXPECT_TRUE(dst.Intact()) << c.name;
-    return dst.values();
-}
-
-TYPED_TEST(Thresholds, EqualNaNAndSignedZeroElementsPassAndValueIsStoredAsGiven)
+// By hand: +0 against -0 and a NaN level leave every element's own bits.
+TYPED_TEST(Thresholds, SignedZerosAndNaNLevelPass)
 {
     using T = TypeParam;
-    const auto cases = ThresholdCases<T>();
-    const T nan = QuietNaN<T>(0x55), negNan = -QuietNaN<T>(0x99);
-    // Member, value, result at level 0 on {-1, 0, 1}; the value goes in as
-    // given, on the other side of the level or NaN.
-    const std::tuple<int, T, std::vector<T>> table[] = {
-        {0, T(0), {T(0), T(0), T(1)}},        {1, T(0), {T(-1), T(0), T(0)}},
-        {2, T(5), {T(5), T(0), T(1)}},        {4, T(-5), {T(-1), T(0), T(-5)}},
-        {2, T(100), {T(100), T(0), T(1)}},    {3, nan, {nan, T(0), T(1)}},
-        {4, T(-100), {T(-1), T(0), T(-100)}}, {5, nan, {T(-1), T(0), nan}}};
-    for (const auto& [k, value, expected] : table)
-        EXPECT_TRUE(SameBitsArray(expected, RunCase(cases[k], {T(-1), T(0), T(1)}, T(0), value))) << cases[k].name;
-    const std::vector<T> x = {T(-3), nan, T(3), negNan, T(0)}, zeros = {T(0), -T(0)};
-    for (const auto& c : cases) {
-        SCOPED_TRACE(c.name);
-        const auto out = RunCase(c, x, T(0), T(7));
-        EXPECT_TRUE(SameBits(nan, out[1]));
-        EXPECT_TRUE(SameBits(negNan, out[3]));
-        EXPECT_TRUE(SameBitsArray(x, RunCase(c, x, nan, T(7))));
-        EXPECT_TRUE(SameBitsArray(zeros, RunCase(c, zeros, -T(0), T(9))));
-        EXPECT_TRUE(SameBitsArray(zeros, RunCase(c, zeros, T(0), T(9))));
-    }
+    const std::vector<T> x = {T(-3), QuietNaN<T>(0x55), T(3), -QuietNaN<T>(0x99), T(0)}, zeros = {T(0), -T(0)};
+    const auto stands = [](const std::vector<T>& in) {
+        return [&in](const char* name, auto, auto member) {
+            constexpr bool inPlace = std::is_invocable<decltype(member), unsigned int, T*>::value;
+            std::vector<T> out = inPlace ? in : std::vector<T>(in.size(), QuietNaN<T>(0x7E));
+            if constexpr (inPlace) member(static_cast<unsigned int>(in.size()), out.data());
+            else member(static_cast<unsigned int>(in.size()), in.data(), out.data());
+            EXPECT_TRUE(SameBitsArray(in, out)) << name;
+        };
+    };
+    EachMember(QuietNaN<T>(1), T(7), stands(x));
+    EachMember(T(0), T(9), stands(zeros));
+    EachMember(-T(0), T(9), stands(zeros));
 }
 
-// Random data with ties against the level, signed zeros and NaNs, across
-// sizes that reach the vector body and the scalar tail.
+// Random data with ties against the level, signed zeros and NaNs.
 template <class T>
 std::vector<T> LevelRichReals(std::size_t count, std::uint32_t seed, T level)
 {
@@ -134,66 +73,55 @@ std::vector<T> LevelRichReals(std::size_t count, std::uint32_t seed, T level)
     std::mt19937 engine(seed + 17u);
     for (auto& v : values) {
         const auto k = engine() % 8;
-        v = k == 0 ? level : k == 1 ? QuietNaN<T>(engine() % 64 + 1) : k == 2 ? -T(0) : v;
+        v = k == 0 ? level : k == 1 ? QuietNaN<T>(engine() % 64 + 1) : k == 2 ? -T(0) : k == 3 ? T(0) : v;
     }
     return values;
 }
 
+// Values either side of the level, a NaN value, a -0 and a NaN level; for
+// Trim (low, high), the first with low above high.
 TYPED_TEST(Thresholds, MatchTheScalarRuleOnRandomAndOverlappingData)
 {
     using T = TypeParam;
+    const std::pair<T, T> parameters[] = {
+        {T(0.25), T(-9.5)}, {T(-0.5), T(0.75)}, {-T(0), QuietNaN<T>(0x42)}, {QuietNaN<T>(0x24), T(7)}};
     std::uint32_t seed = 2000;
-    for (const auto& c : ThresholdCases<T>()) {
-        for (const auto& [level, value] : {std::make_pair(T(0.25), T(-9.5)), std::make_pair(T(-0.5), T(0.75))}) {
-            for (unsigned int n : SizesFromZero()) {
-                SCOPED_TRACE(c.name + " size " + std::to_string(n) + " " + SeedTrace(seed));
-                const auto x = LevelRichReals<T>(n, seed++, level);
-                std::vector<T> expected(n);
-                for (std::size_t i = 0; i < n; ++i) expected[i] = c.rule(x[i], level, value);
-                EXPECT_TRUE(SameBitsArray(expected, RunCase(c, x, level, value)));
-            }
+    for (const auto& [level, value] : parameters) {
+        for (unsigned int n : InterestingSizes()) {
+            SCOPED_TRACE(::testing::Message() << "level " << level << " value " << value << " size " << n << " "
+                                              << SeedTrace(seed));
+            const auto x = LevelRichReals<T>(n, seed++, level);
+            EachMember(level, value, [&x](const char* name, auto rule, auto member) {
+                SCOPED_TRACE(name);
+                ExpectMatches(x, rule, member);
+            });
         }
-        if (c.inPlace) continue;
-        // dst one element behind src: the replacement written at i is read
-        // as the source of i + 1.
-        auto buffer = LevelRichReals<T>(132, seed++, T(0)), expected = buffer;
-        for (std::size_t i = 0; i + 1 < buffer.size(); ++i) expected[i + 1] = c.rule(expected[i], T(0), T(3));
-        c.run(131u, buffer.data() + 1, buffer.data(), T(0), T(3));
-        EXPECT_TRUE(SameBitsArray(expected, buffer)) << c.name << " overlapping";
     }
 }
 
+// The low side is tested first: with low above high every other element
+// becomes high. A NaN bound disables its side.
 TEST(TrimFloat, LowIsTestedFirstAndNaNPasses)
 {
-    const auto trim = ThresholdCases<float>().back();
+    const auto trim = [](std::vector<float> x, float low, float high) {
+        ku::Trim(static_cast<unsigned int>(x.size()), x.data(), low, high);
+        return x;
+    };
     const float nan = QuietNaN<float>(0x321);
-    EXPECT_TRUE(SameBitsArray({-1, -1, 0, 1, 1}, RunCase(trim, {-2, -1, 0, 1, 2}, -1.0f, 1.0f)));
-    EXPECT_TRUE(SameBitsArray({1, 1, -1}, RunCase(trim, {-2, 0, 2}, 1.0f, -1.0f)));
-    // A NaN element stays, a NaN bound disables its side, signed zeros stand.
-    EXPECT_TRUE(SameBitsArray({nan, -1, 1}, RunCase(trim, {nan, -5, 5}, -1.0f, 1.0f)));
-    EXPECT_TRUE(SameBitsArray({-5, 1}, RunCase(trim, {-5, 5}, nan, 1.0f)));
-    EXPECT_TRUE(SameBitsArray({-1, 5}, RunCase(trim, {-5, 5}, -1.0f, nan)));
-    EXPECT_TRUE(SameBitsArray({0.0f, -0.0f}, RunCase(trim, {0.0f, -0.0f}, -0.0f, 0.0f)));
+    EXPECT_TRUE(SameBitsArray({-1, -1, 0, 1, 1}, trim({-2, -1, 0, 1, 2}, -1.0f, 1.0f)));
+    EXPECT_TRUE(SameBitsArray({1, 1, -1}, trim({-2, 0, 2}, 1.0f, -1.0f)));
+    EXPECT_TRUE(SameBitsArray({-5, 1}, trim({-5, 5}, nan, 1.0f)));
+    EXPECT_TRUE(SameBitsArray({-1, 5}, trim({-5, 5}, -1.0f, nan)));
 }
 
-// ---------------------------------------------------------------------------
-// VectorSlope.
-// ---------------------------------------------------------------------------
+// T(i) * slope + offset, two roundings; the data must tell a running sum and a
+// fused step apart.
 TYPED_TEST(Thresholds, VectorSlopeComputesEachElementFromItsIndex)
 {
     using T = TypeParam;
-    GuardedBuffer<T> hand(5, T(-1));
-    ku::VectorSlope(4u, hand.data(), T(1), T(0.5));
-    EXPECT_TRUE(SameBitsArray({T(1), T(1.5), T(2), T(2.5), T(-1)}, hand.values())) << "start, then step";
-    ku::VectorSlope(5u, hand.data(), T(0), T(0));
-    EXPECT_TRUE(SameBitsArray(std::vector<T>(5, T(0)), hand.values()));
-    // hand[3] is 3 * 0.1 rounded, plus 0: not three additions of 0.1.
-    ku::VectorSlope(4u, hand.data(), T(0), T(0.1));
-    EXPECT_TRUE(SameBits(T(T(3) * T(0.1)) + T(0), hand[3]));
-    EXPECT_TRUE(hand.Intact());
     std::uint32_t seed = 2300;
     bool driftSeen = false, fusedSeen = false;
-    for (unsigned int n : SizesFromZero()) {
+    for (unsigned int n : SizesWithZero()) {
         SCOPED_TRACE("size " + std::to_string(n) + " " + SeedTrace(seed));
         const auto params = RandomReals<T>(2, seed++, T(-100), T(100));
         const T offset = params[0], slope = params[1];

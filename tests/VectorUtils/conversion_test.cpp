@@ -1,8 +1,5 @@
-// Convert: the hand-worked values of each overload (limits, wraps, the
-// indefinite value, the mixed float/double path), then every overload against
-// a plain loop written here around the runtime's pow, powf, lroundf and
-// lround, bit for bit, on seeded random data with halves, huge values, NaN
-// and infinities; rounding under every rounding mode; exact round trips.
+// Convert: limits, wraps, saturation and the indefinite value by hand, then
+// every overload against a plain loop, under every rounding mode.
 
 #include <kestaccel/VectorUtils.h>
 
@@ -10,7 +7,6 @@
 #include <cfenv>
 #include <climits>
 #include <cmath>
-#include <cstdlib>
 #include <cstring>
 #include <limits>
 #include <random>
@@ -25,14 +21,8 @@ using kestcore::utility::int24_t;
 namespace ku = kestaccel::utility;
 using Ints = std::vector<long long>;
 
-// ---------------------------------------------------------------------------
-// The reference: plain scalar steps, one element at a time.
-// ---------------------------------------------------------------------------
-
-// Round half away from zero, as lroundf and lround do. MinGW's runtime adds
-// one half and rounds the largest value below one half (0.49999997f) up to
-// 1; there the reference rounds through the exact fraction instead, so that
-// both platforms check the library against the correct result.
+// Round half away from zero, as lroundf and lround do; MinGW's adds one half
+// (0.49999997f rounds up to 1), so there the exact fraction decides.
 template <class Real>
 long RoundHalfAway(Real x)
 {
@@ -46,8 +36,7 @@ long RoundHalfAway(Real x)
 #endif
 }
 
-// Truncation, or lroundf for float and lround for double; NaN and results
-// outside int give the indefinite value explicitly, whatever the width of long.
+// Truncation or rounding; NaN and results outside int give the indefinite value.
 template <class Real>
 int RefInt(Real x, bool round)
 {
@@ -75,8 +64,7 @@ Dst RefFromReal(float x, int scale, bool round)
     return RefStore<Dst>(RefInt(scale == 0 ? x : (x >= 1.0f ? m : (x <= -1.0f ? -m : x * m)), round));
 }
 
-// The double source: limited elements take the float +-m, the others
-// (double)m * x.
+// A double source: limited elements take the float +-m, the others (double)m * x.
 template <class Dst>
 Dst RefFromReal(double x, int scale, bool round)
 {
@@ -92,19 +80,12 @@ Real RefToReal(int value, int scale)
     return scale == 0 ? static_cast<Real>(value) : static_cast<Real>(value) * m;
 }
 
-// Bits for floating values, integer values otherwise (a packed word's value
-// is one-to-one with its bytes).
+// Bits for floating values, values otherwise (a packed word's value is its bytes).
 template <class T>
 ::testing::AssertionResult Same(const std::vector<T>& expected, const std::vector<T>& actual)
 {
-    if constexpr (std::is_floating_point_v<T>) {
-        return SameBitsArray(expected, actual);
-    } else {
-        const Ints e(expected.begin(), expected.end()), a(actual.begin(), actual.end());
-        const auto at = std::mismatch(e.begin(), e.end(), a.begin(), a.end());
-        if (at.first == e.end() && at.second == a.end()) return ::testing::AssertionSuccess();
-        return ::testing::AssertionFailure() << "first difference at index " << (at.first - e.begin());
-    }
+    if constexpr (std::is_floating_point_v<T>) return SameBitsArray(expected, actual);
+    else return SameBitsArray(Ints(expected.begin(), expected.end()), Ints(actual.begin(), actual.end()));
 }
 
 // One call of the library on a guarded destination.
@@ -117,8 +98,7 @@ std::vector<Dst> Converted(const std::vector<Src>& src, Args... args)
     return dst.values();
 }
 
-// 37 copies of one value reach the vectorised body and the tail; the values
-// come back as integers.
+// 37 copies of one value reach the vectorised body and the tail.
 template <class Dst, class Src, class... Args>
 Ints Copies(Src x, Args... args)
 {
@@ -126,9 +106,8 @@ Ints Copies(Src x, Args... args)
     return Ints(dst.begin(), dst.end());
 }
 
-// Floating sources that reach every branch: in-range values, halves before
-// and after scaling, the limits and their neighbours, huge values, NaN with
-// payloads and either sign, infinities, signed zeros, subnormals.
+// Floating sources for every branch: halves before and after scaling, the
+// limits and their neighbours, huge values, NaNs, infinities, signed zeros.
 template <class Real>
 std::vector<Real> MixedSources(std::size_t count, std::uint32_t seed, int scale)
 {
@@ -174,10 +153,6 @@ std::vector<Src> RandomIntegers(std::size_t count, std::uint32_t seed)
     return values;
 }
 
-// ---------------------------------------------------------------------------
-// Hand-worked values.
-// ---------------------------------------------------------------------------
-
 // Float sources to every integer destination (both rounding flags unless
 // `round` is 0 or 1), and the same source as a double to int.
 TEST(ConvertHandWorked, FloatToIntegerTable)
@@ -185,28 +160,20 @@ TEST(ConvertHandWorked, FloatToIntegerTable)
     const float nan = std::numeric_limits<float>::quiet_NaN();
     const struct { float x; int scale, round; long long u8, s16, s32, s24; } rows[] = {
         // Limits wrap in 8 and 16 bits, saturate in 24, are indefinite in 32.
-        {0.5f, -15, 2, 0, 16384, 16384, 16384},        {1.0f, -15, 2, 0, -32768, 32768, 32768},
-        {1.5f, -15, 2, 0, -32768, 32768, 32768},       {-1.0f, -15, 2, 0, -32768, -32768, -32768},
-        {-1.5f, -15, 2, 0, -32768, -32768, -32768},    {1.0f, -7, 2, 128, 128, 128, 128},
-        {-1.0f, -7, 2, 128, -128, -128, -128},         {0.5f, -7, 2, 64, 64, 64, 64},
+        {1.0f, -15, 2, 0, -32768, 32768, 32768},       {1.5f, -15, 2, 0, -32768, 32768, 32768},
+        {1.0f, -7, 2, 128, 128, 128, 128},             {-1.0f, -7, 2, 128, -128, -128, -128},
         {-0.5f, -7, 2, 192, -64, -64, -64},            {1.0f, -23, 2, 0, 0, 8388608, 8388607},
-        {-1.0f, -23, 2, 0, 0, -8388608, -8388608},     {0.5f, -23, 2, 0, 0, 4194304, 4194304},
-        {1.0f, -31, 2, 0, 0, INT_MIN, -8388608},       {-1.0f, -31, 2, 0, 0, INT_MIN, -8388608},
+        {-1.0f, -23, 2, 0, 0, -8388608, -8388608},     {1.0f, -31, 2, 0, 0, INT_MIN, -8388608},
         {0.5f, -31, 2, 0, 0, 1073741824, 8388607},
         // scale 0 has no limit: 70000 keeps its low bits, 1e10 is indefinite.
-        {70000.0f, 0, 2, 0x70, 4464, 70000, 70000},    {-70000.0f, 0, 2, 0x90, -4464, -70000, -70000},
-        {1e10f, 0, 2, 0, 0, INT_MIN, -8388608},
+        {70000.0f, 0, 2, 0x70, 4464, 70000, 70000},    {1e10f, 0, 2, 0, 0, INT_MIN, -8388608},
         // m = 0.5 at scale 1: a limited source truncates to 0, rounds to 1.
-        {1.0f, 1, 0, 0, 0, 0, 0},                      {7.0f, 1, 0, 0, 0, 0, 0},
         {1e30f, 1, 0, 0, 0, 0, 0},                     {1e30f, 1, 1, 1, 1, 1, 1},
-        // NaN is indefinite, scaled or not.
         {nan, 0, 2, 0, 0, INT_MIN, -8388608},          {-nan, -15, 2, 0, 0, INT_MIN, -8388608},
         // Halves away from zero against truncation.
         {2.5f, 0, 1, 3, 3, 3, 3},                      {-2.5f, 0, 1, 253, -3, -3, -3},
-        {0.5f, 0, 1, 1, 1, 1, 1},                      {-0.5f, 0, 1, 255, -1, -1, -1},
-        {1.49999988f, 0, 1, 1, 1, 1, 1},               {-1.49999988f, 0, 1, 255, -1, -1, -1},
-        {2.5f, 0, 0, 2, 2, 2, 2},                      {-2.5f, 0, 0, 254, -2, -2, -2},
-        {-0.5f, 0, 0, 0, 0, 0, 0},                     {-1.49999988f, 0, 0, 255, -1, -1, -1},
+        {-0.5f, 0, 1, 255, -1, -1, -1},                {1.49999988f, 0, 1, 1, 1, 1, 1},
+        {-2.5f, 0, 0, 254, -2, -2, -2},                {-0.5f, 0, 0, 0, 0, 0, 0},
     };
     for (const auto& r : rows) {
         for (bool round : {false, true}) {
@@ -221,9 +188,8 @@ TEST(ConvertHandWorked, FloatToIntegerTable)
     }
 }
 
-// Double to int keeps the float m for limited elements and multiplies the
-// others in double: 0.1 * 2^31 is 214748364.8 in double, while the float
-// 0.1f * 2^31 would give 214748368. At scale 1, lroundf(+-0.5f) is +-1.
+// Limited elements take the float m, the others multiply in double: 0.1 * 2^31
+// gives 214748364, 0.1f * 2^31 would give 214748368.
 TEST(ConvertHandWorked, DoubleToIntMixesFloatLimitAndDoubleProduct)
 {
     const struct { double x; int scale; bool round; long long expected; } rows[] = {
@@ -234,24 +200,13 @@ TEST(ConvertHandWorked, DoubleToIntMixesFloatLimitAndDoubleProduct)
         EXPECT_EQ(Ints(37, r.expected), Copies<int>(r.x, r.scale, r.round)) << r.x << " scale " << r.scale;
 }
 
-// Each value from every integer source that holds it. The float multiplier is
-// the double 2^-scale narrowed: 2^-140 survives as a subnormal, 2^-160 is 0,
-// and 2^-150 narrows to 0 too, so 3 * m is +0 where a product formed in
-// double and narrowed afterwards would give 2^-148.
+// The float multiplier is the narrowed double 2^-scale: 2^-150 becomes 0, so
+// 3 * m is +0, not 2^-148.
 TEST(ConvertHandWorked, IntegerToRealTable)
 {
     const struct { int v, scale; float f; double d; } rows[] = {
-        {0, 0, 0.0f, 0.0},                      {-32768, 0, -32768.0f, -32768.0},   {32767, 0, 32767.0f, 32767.0},
-        {-8388608, 0, -8388608.0f, -8388608.0}, {8388607, 0, 8388607.0f, 8388607.0},
-        {INT_MIN, 0, -2147483648.0f, -2147483648.0},
-        {INT_MAX, 0, 2147483648.0f, 2147483647.0},  // rounded to nearest in float
-        {-32768, 15, -1.0f, -1.0},              {16384, 15, 0.5f, 0.5},             {-8388608, 23, -1.0f, -1.0},
-        {INT_MIN, 31, -1.0f, -1.0},             {3, -2, 12.0f, 12.0},  // a negative exponent multiplies
-        {1, 140, std::ldexp(1.0f, -140), std::ldexp(1.0, -140)},
-        {-1, 140, -std::ldexp(1.0f, -140), -std::ldexp(1.0, -140)},
-        {1, 160, 0.0f, std::ldexp(1.0, -160)},  {-1, 160, -0.0f, -std::ldexp(1.0, -160)},
-        {3, 150, 0.0f, std::ldexp(3.0, -150)},
-    };
+        {-32768, 15, -1.0f, -1.0}, {3, -2, 12.0f, 12.0}, {3, 150, 0.0f, std::ldexp(3.0, -150)},
+        {-1, 160, -0.0f, -std::ldexp(1.0, -160)}};
     for (const auto& r : rows) {
         SCOPED_TRACE(::testing::Message() << r.v << " scale " << r.scale);
         EXPECT_TRUE(SameBits(r.f, Converted<int, float>({r.v}, r.scale)[0]));
@@ -268,29 +223,17 @@ TEST(ConvertHandWorked, IntegerToRealTable)
 
 TEST(ConvertHandWorked, PackedAndWidth)
 {
-    // Shifted right by the low five bits of scale (toward minus infinity, no
-    // rounding), then saturated; 40 and -24 both shift by 8.
+    // Shifted right by the low five bits of scale (toward minus infinity),
+    // then saturated; 40 and -24 both shift by 8.
     const struct { int v, scale, expected; } shifts[] = {
-        {0x7FFFFF00, 8, 8388607}, {-256, 8, -1}, {-257, 8, -2}, {511, 8, 1},    {8388608, 0, 8388607},
-        {-8388609, 0, -8388608},  {-5, 0, -5},   {-256, 40, -1}, {-256, -24, -1}};
+        {0x7FFFFF00, 8, 8388607}, {-257, 8, -2}, {511, 8, 1}, {-8388609, 0, -8388608}, {-256, 40, -1}, {-256, -24, -1}};
     for (const auto& s : shifts)
         EXPECT_EQ(s.expected, static_cast<int>(Converted<int, int24_t>({s.v}, s.scale)[0])) << s.v << " >> " << s.scale;
     EXPECT_TRUE((Converted<int, int24_t>({}, 8).empty()));  // count 0: the guard sees no write
 
     // Sign extension of bit 23 (bytes FF FF FF, FF FF 7F, 00 00 80), no shift.
     EXPECT_EQ((std::vector<int>{-1, 8388607, -8388608}), (Converted<int24_t, int>({-1, 8388607, -8388608})));
-
-    const double inf = std::numeric_limits<double>::infinity();
-    EXPECT_TRUE(SameBitsArray(std::vector<float>{float(inf), float(-inf), -0.0f, static_cast<float>(0.1)},
-                              Converted<double, float>({1e300, -1e300, -0.0, 0.1})));
-    EXPECT_TRUE(SameBitsArray(std::vector<double>{-0.0, static_cast<double>(0.1f), inf},
-                              Converted<float, double>({-0.0f, 0.1f, float(inf)})));
 }
-
-// ---------------------------------------------------------------------------
-// Every overload against the plain loop, count 0 included (the guard checks
-// that nothing is written).
-// ---------------------------------------------------------------------------
 
 template <class Dst, class Src, class Ref, class... Args>
 ::testing::AssertionResult MatchesLoop(const std::vector<Src>& src, Ref ref, Args... args)
@@ -318,21 +261,10 @@ void CheckFromReal(std::uint32_t seedBase)
     }
 }
 
-// Float bit patterns with an odd stride: every exponent, both signs, NaNs
-// and infinities, each with some 500 varied fractions, through the unscaled
-// int path.
-TEST(ConvertDifferential, FloatBitPatternSweep)
-{
-    std::vector<float> src;
-    for (std::uint64_t u = 0; u < (1ull << 32); u += 16411) src.push_back(FromBits<float>(static_cast<std::uint32_t>(u)));
-    for (bool round : {false, true})
-        EXPECT_TRUE(MatchesLoop<int>(src, [round](float x) { return RefInt(x, round); }, 0, round)) << round;
-}
-
 template <class Src, class Real>
 void CheckToReal(std::uint32_t seedBase)
 {
-    for (int scale : {0, 15, 23, 31, 1, -2, -20, 140, 1100, -200}) {
+    for (int scale : {0, 15, 23, 31, 1, -2, -20, 140, 150, 160, 1100, -200}) {
         for (unsigned int n : kCounts) {
             const std::uint32_t seed = seedBase + n + static_cast<std::uint32_t>(scale + 2000);
             SCOPED_TRACE(::testing::Message() << SeedTrace(seed) << " scale " << scale << " count " << n);
@@ -342,9 +274,9 @@ void CheckToReal(std::uint32_t seedBase)
     }
 }
 
-// The scaled overloads, those without a scale, and the floor division by
-// 2^(scale & 31) with saturation of int to packed.
-TEST(ConvertDifferential, EveryOverloadMatchesPlainLoop)
+// Every overload; int to packed is a floor division by 2^(scale & 31), then
+// saturation; float bit patterns of every exponent through the unscaled path.
+void CheckEveryOverload()
 {
     CheckFromReal<float, unsigned char>(1000);
     CheckFromReal<float, short>(1100);
@@ -372,23 +304,26 @@ TEST(ConvertDifferential, EveryOverloadMatchesPlainLoop)
         };
         ASSERT_TRUE(MatchesLoop<int24_t>(RandomIntegers<int>(1029, seed), floorDivide, scale));
     }
+    std::vector<float> bits;
+    for (std::uint64_t u = 0; u < (1ull << 32); u += 16411) bits.push_back(FromBits<float>(static_cast<std::uint32_t>(u)));
+    for (bool round : {false, true})
+        ASSERT_TRUE(MatchesLoop<int>(bits, [round](float x) { return RefInt(x, round); }, 0, round)) << round;
 }
 
-// The rounding step alone decides halfway cases, whatever the processor's
-// rounding mode: an added 0.49999997 would not survive this.
-TEST(ConvertRoundingMode, IndependentOfProcessorMode)
+// Under every rounding mode: halfway cases must not depend on it (an added
+// 0.49999997 would), and the reference loops follow the same mode.
+TEST(ConvertDifferential, EveryOverloadMatchesPlainLoopInEveryRoundingMode)
 {
     const int saved = std::fegetround();
-    for (int mode : {FE_UPWARD, FE_DOWNWARD, FE_TOWARDZERO}) {
-        SCOPED_TRACE(::testing::Message() << "mode " << mode);
+    for (int mode : {FE_TONEAREST, FE_UPWARD, FE_DOWNWARD, FE_TOWARDZERO}) {
+        SCOPED_TRACE(::testing::Message() << "rounding mode " << mode);
         std::fesetround(mode);
-        CheckFromReal<float, short>(1100);
-        CheckFromReal<float, int>(1200);
-        CheckFromReal<double, int>(2000);
+        CheckEveryOverload();
         std::fesetround(saved);
     }
 }
 
+// Every short, and random 24-bit words, through the unit float range and back.
 TEST(ConvertRoundTrip, ShortAndPackedThroughFloatAreExact)
 {
     std::vector<short> all(65536);
@@ -402,31 +337,23 @@ TEST(ConvertRoundTrip, ShortAndPackedThroughFloatAreExact)
     }
 }
 
-// Source and destination on one buffer, the destination `offset` bytes in:
-// the result is the ascending element loop's, run here on `bytes` (left
-// holding its result). Packing to 24 bits on the source itself (as audio code
-// does to save a copy) puts each 3-byte write behind the 4-byte reads still
-// to come; with the destination ahead, the first elements read bytes written
-// by earlier ones, which a blocked fast path would read too early.
-// Unpacking writes ahead of the reads still to come.
+// One buffer, dst `offset` bytes in, against the ascending loop run on `bytes`:
+// a blocked fast path would read too early.
 template <class Src, class Dst, class Ref, class... Args>
 ::testing::AssertionResult InPlaceMatchesLoop(std::vector<unsigned char>& bytes, std::size_t offset, Ref ref,
                                               Args... args)
 {
-    auto* raw = static_cast<unsigned char*>(std::malloc(bytes.size()));
-    std::memcpy(raw, bytes.data(), bytes.size());
+    std::vector<unsigned char> raw = bytes;
     const std::size_t n = (bytes.size() - offset) / std::max(sizeof(Src), sizeof(Dst));
-    ku::Convert(static_cast<unsigned int>(n), reinterpret_cast<const Src*>(raw), reinterpret_cast<Dst*>(raw + offset),
-                args...);
+    ku::Convert(static_cast<unsigned int>(n), reinterpret_cast<const Src*>(raw.data()),
+                reinterpret_cast<Dst*>(raw.data() + offset), args...);
     for (std::size_t i = 0; i < n; ++i) {
         Src x;
         std::memcpy(&x, &bytes[i * sizeof(Src)], sizeof x);
         const Dst y = ref(x);
         std::memcpy(&bytes[offset + i * sizeof(Dst)], &y, sizeof y);
     }
-    const bool same = std::memcmp(raw, bytes.data(), bytes.size()) == 0;
-    std::free(raw);
-    if (same) return ::testing::AssertionSuccess();
+    if (raw == bytes) return ::testing::AssertionSuccess();
     return ::testing::AssertionFailure() << "differs from the ascending element loop, offset " << offset;
 }
 

@@ -15,9 +15,8 @@ namespace {
 
 using kestcore::utility::int24_t;
 
-// Three bytes with no padding and alignment 1: elements written at odd
-// addresses inside a byte buffer land little-endian with a stride of three
-// and touch nothing else, and read back as written.
+// Three bytes, alignment 1: elements at odd addresses land little-endian with a
+// stride of three and touch nothing else.
 TEST(Int24, LayoutAndUnalignedAccess)
 {
     EXPECT_EQ(3u, sizeof(int24_t));

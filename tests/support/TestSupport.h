@@ -5,6 +5,8 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <cmath>
 #include <complex>
 #include <cstdint>
 #include <cstring>
@@ -36,6 +38,28 @@ T FromBits(BitsType<T> bits)
     std::memcpy(&value, &bits, sizeof value);
     return value;
 }
+
+// The quiet NaN of T with `payload` in its low fraction bits and a clear sign.
+template <class T>
+T QuietNaN(std::uint64_t payload = 0)
+{
+    return FromBits<T>(Bits(std::numeric_limits<T>::quiet_NaN()) | static_cast<BitsType<T>>(payload));
+}
+
+// KESTACCEL_PROBE(Name, call written with T): Name<T>::value tells whether the
+// call compiles, so that overloads left out on purpose stay out. Arg<U>() is a
+// value of type U for such unevaluated calls.
+template <class U>
+U Arg();
+#define KESTACCEL_PROBE(Name, ...)                                           \
+    template <class T, class = void>                                          \
+    struct Name : std::false_type {};                                         \
+    template <class T>                                                        \
+    struct Name<T, std::void_t<decltype(__VA_ARGS__)>> : std::true_type {};
+
+// A deliberate gap: the probe sees the overload for Has and none for Lacks.
+template <template <class...> class Probe, class Has, class Lacks>
+constexpr bool kGap = Probe<Has>::value && !Probe<Lacks>::value;
 
 // Equality of bit patterns, printed in hex, so that -0 against +0 and one NaN
 // payload against another both fail.
@@ -121,6 +145,49 @@ private:
     std::vector<T> storage_;
 };
 
+// out[i] against ref(in[i]) (or ref(in[i], i)) bit for bit, with the sentinel
+// and count 0; `member` takes (count, src, dst) or, on a copy of the input,
+// (count, srcDst). Where it reads and writes one type, dst one element ahead
+// of or behind src must give the plain ascending loop's result; there a NaN
+// may meet another NaN and keep either payload, so any NaN matches a NaN.
+template <class E, class Ref, class Member>
+void ExpectMatches(const std::vector<E>& in, Ref ref, Member member)
+{
+    const auto at = [&ref](E x, std::size_t i) {
+        if constexpr (std::is_invocable<Ref, E, std::size_t>::value) return ref(x, i);
+        else return ref(x);
+    };
+    using D = decltype(at(E(), 0));
+    constexpr bool inPlace = std::is_invocable<Member, unsigned int, E*>::value;
+    const auto n = static_cast<unsigned int>(in.size());
+    GuardedBuffer<D> out(n), none(0);
+    if constexpr (inPlace) {
+        std::copy(in.begin(), in.end(), out.data());
+        member(n, out.data());
+        member(0u, none.data());
+    } else {
+        member(n, in.data(), out.data());
+        member(0u, static_cast<const E*>(nullptr), none.data());
+    }
+    for (std::size_t i = 0; i < n; ++i) ASSERT_TRUE(SameBits(at(in[i], i), out[i])) << "at index " << i << " of " << n;
+    EXPECT_TRUE(out.Intact() && none.Intact());
+    if constexpr (!inPlace && std::is_same<D, E>::value) {
+        for (const std::size_t ahead : {1, 0}) {
+            std::vector<E> buffer(in);
+            buffer.push_back(E(0.75));
+            auto chained = buffer;
+            for (std::size_t i = 0; i < n; ++i) chained[i + ahead] = at(chained[i + 1 - ahead], i);
+            member(n, buffer.data() + 1 - ahead, buffer.data() + ahead);
+            for (std::size_t i = 0; i <= n; ++i) {
+                if constexpr (std::is_floating_point<E>::value)
+                    if (std::isnan(chained[i]) && std::isnan(buffer[i])) continue;
+                ASSERT_TRUE(SameBits(chained[i], buffer[i])) << "at index " << i << " with dst one element "
+                                                             << (ahead ? "ahead" : "behind");
+            }
+        }
+    }
+}
+
 // Reproducible random data. Each test names its seed; a failure message
 // carries it through SCOPED_TRACE so that the case can be replayed.
 template <class T>
@@ -148,6 +215,14 @@ inline std::string SeedTrace(std::uint32_t seed) { return "seed " + std::to_stri
 inline const std::vector<unsigned int>& InterestingSizes()
 {
     static const std::vector<unsigned int> sizes = {1, 2, 3, 4, 5, 7, 8, 15, 16, 17, 31, 32, 33, 63, 64, 65, 127, 1023, 4099};
+    return sizes;
+}
+
+// The same sizes with 0 first, which must write nothing.
+inline std::vector<unsigned int> SizesWithZero()
+{
+    std::vector<unsigned int> sizes = InterestingSizes();
+    sizes.insert(sizes.begin(), 0u);
     return sizes;
 }
 
