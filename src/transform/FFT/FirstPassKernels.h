@@ -93,6 +93,42 @@ inline void StoreGroup(E* dstRe, E* dstIm, std::size_t g, const E* r, const E* m
     }
 }
 
+constexpr std::size_t kRun = 4;
+
+// The groups of a run are held point by point: values[t * kRun + l] is
+// point t of the run's group l. Each part (real or imaginary) of kCount
+// points of every group goes to to + groupStride * groups[l] onwards. The
+// loop runs over the points with the run innermost, one part at a time, so
+// that g++ reads a point's kRun values as one group and transposes them
+// with shuffles (unrolled first, or with both parts in one loop, it stores
+// element by element).
+template <class E, std::size_t kCount>
+inline void ScatterRunPart(E* __restrict to, std::size_t groupStride, const std::size_t* groups,
+                           const E* __restrict values)
+{
+#if defined(__GNUC__)
+#pragma GCC unroll 1
+#endif
+    for (std::size_t t = 0; t < kCount; ++t)
+        for (std::size_t l = 0; l < kRun; ++l) to[groupStride * groups[l] + t] = values[t * kRun + l];
+}
+
+// The kRun groups of a run, each stored whole in the destination's form.
+template <class E, Form kDst, std::size_t kGroup>
+inline void StoreRunOfGroups(E* dstRe, E* dstIm, const std::size_t* groups, const E* re, const E* im)
+{
+    if constexpr (kDst == Form::kBlocked) {
+        constexpr std::size_t lanes = kLanes<E>;
+        for (std::size_t b = 0; b < kGroup / lanes; ++b) {
+            ScatterRunPart<E, lanes>(dstRe + 2 * lanes * b, 2 * kGroup, groups, re + lanes * b * kRun);
+            ScatterRunPart<E, lanes>(dstRe + 2 * lanes * b + lanes, 2 * kGroup, groups, im + lanes * b * kRun);
+        }
+    } else {
+        ScatterRunPart<E, kGroup>(dstRe, kGroup, groups, re);
+        ScatterRunPart<E, kGroup>(dstIm, kGroup, groups, im);
+    }
+}
+
 // The permuted copy from a distinct source, for a transform of kGroup
 // points (orders 2 and 3): its one group gathers the points at the
 // bit-reversed positions and takes the first stages. kConjugate negates
@@ -121,8 +157,6 @@ template <class E, Form kSrc, Form kDst, bool kConjugate, std::size_t kGroup>
 // the loads are contiguous and the first stages run on vectors across the
 // run; the kRun groups of a run lie spread through the destination
 // (bit-reversed run positions apart), each stored whole.
-constexpr std::size_t kRun = 4;
-
 template <class E, Form kSrc, Form kDst, bool kConjugate, std::size_t kGroup>
 [[gnu::noinline]] void GatherFirstStagesByRuns(std::uint32_t order, const E* __restrict srcRe,
                                                const E* __restrict srcIm, E* __restrict dstRe, E* __restrict dstIm,
@@ -135,12 +169,12 @@ template <class E, Form kSrc, Form kDst, bool kConjugate, std::size_t kGroup>
     const std::size_t spread = quarter / kRun;
     for (std::size_t r0 = 0; r0 < quarter; r0 += kRun) {
         const std::size_t g0 = ReverseBits(r0, bits);
-        E re[kGroup][kRun], im[kGroup][kRun];
+        E re[kGroup * kRun], im[kGroup * kRun];
         for (std::size_t t = 0; t < kGroup; ++t) {
             for (std::size_t l = 0; l < kRun; ++l) {
                 const std::size_t p = r0 + l + ReversedPosition<kGroup>(t) * quarter;
-                re[t][l] = S::Re(srcRe, srcIm, p, 0);
-                im[t][l] = kConjugate ? -S::Im(srcRe, srcIm, p, 0) : S::Im(srcRe, srcIm, p, 0);
+                re[t * kRun + l] = S::Re(srcRe, srcIm, p, 0);
+                im[t * kRun + l] = kConjugate ? -S::Im(srcRe, srcIm, p, 0) : S::Im(srcRe, srcIm, p, 0);
             }
         }
         // Kept a loop so that g++ vectorises it across the run rather than
@@ -151,23 +185,18 @@ template <class E, Form kSrc, Form kDst, bool kConjugate, std::size_t kGroup>
         for (std::size_t l = 0; l < kRun; ++l) {
             E r[kGroup], m[kGroup];
             for (std::size_t t = 0; t < kGroup; ++t) {
-                r[t] = re[t][l];
-                m[t] = im[t][l];
+                r[t] = re[t * kRun + l];
+                m[t] = im[t * kRun + l];
             }
             FirstStages<E, kGroup>(r, m, w);
             for (std::size_t t = 0; t < kGroup; ++t) {
-                re[t][l] = r[t];
-                im[t][l] = m[t];
+                re[t * kRun + l] = r[t];
+                im[t * kRun + l] = m[t];
             }
         }
-        for (std::size_t l = 0; l < kRun; ++l) {
-            E r[kGroup], m[kGroup];
-            for (std::size_t t = 0; t < kGroup; ++t) {
-                r[t] = re[t][l];
-                m[t] = im[t][l];
-            }
-            StoreGroup<E, kDst, kGroup>(dstRe, dstIm, g0 + ReversedPosition<kRun>(l) * spread, r, m);
-        }
+        std::size_t groups[kRun];
+        for (std::size_t l = 0; l < kRun; ++l) groups[l] = g0 + ReversedPosition<kRun>(l) * spread;
+        StoreRunOfGroups<E, kDst, kGroup>(dstRe, dstIm, groups, re, im);
     }
 }
 
