@@ -56,6 +56,22 @@ struct FactorChunk {
         }
     }
 
+    // The factors at twice the stride, for a stage of q butterfly positions
+    // whose following stage's 2q factors b and c hold (b the first q, c the
+    // next q, each in one chunk): every other one of those.
+    void EveryOtherOf(const FactorChunk& b, const FactorChunk& c, std::size_t q)
+    {
+        const std::size_t half = q / 2;
+        for (std::size_t t = 0; t < half; ++t) {
+            re[t] = b.re[2 * t];
+            im[t] = b.im[2 * t];
+        }
+        for (std::size_t t = 0; t < half; ++t) {
+            re[half + t] = c.re[2 * t];
+            im[half + t] = c.im[2 * t];
+        }
+    }
+
     template <std::size_t kStride>
     void GatherAt(const E* from, std::size_t count, std::size_t stride)
     {
@@ -146,11 +162,28 @@ template <class E, Form F, Output kOut, bool kScale>
     }
 }
 
+// Split parts of count points into pairs.
+template <class E>
+[[gnu::noinline]] void InterleaveParts(std::size_t count, const E* __restrict re, const E* __restrict im,
+                                       E* __restrict pairs)
+{
+    for (std::size_t k = 0; k < count; ++k) {
+        pairs[2 * k] = re[k];
+        pairs[2 * k + 1] = im[k];
+    }
+}
+
 // Stages s and s + 1; the last pair (s + 1 = order) writes the output.
+// Pairs go through split arrays on the stack, a chunk at a time, and are
+// interleaved from there: written by the butterfly loop itself, they make
+// g++ arrange the whole loop around interleaved vectors, with twice the
+// instructions. The pairs of a chunk's points cover the bytes of the same
+// points in the blocked form, which no other chunk reads.
 template <class E, Form F, Output kOut, bool kScale>
 void StagePair(const FFTPlan<E>& plan, std::uint32_t s, E* re, E* im, E* outRe, E* outIm, E scale)
 {
     using P = Points<E, F>;
+    static_assert(kOut != Output::kPairsInPlace || F == Form::kBlocked, "pairs come from the blocked form");
     const std::size_t n = plan.size;
     const std::size_t q = std::size_t(1) << (s - 1);
     const std::size_t strideB = std::size_t(1) << (plan.order - s - 1);
@@ -159,16 +192,26 @@ void StagePair(const FFTPlan<E>& plan, std::uint32_t s, E* re, E* im, E* outRe, 
     FactorChunk<E> a, b, c;
     for (std::size_t j0 = 0; j0 < q; j0 += kChunk) {
         const std::size_t count = q - j0 < kChunk ? q - j0 : kChunk;
-        a.Gather(plan.twiddles, j0, count, 2 * strideB);
         b.Gather(plan.twiddles, j0, count, strideB);
         c.Gather(plan.twiddles, j0 + q, count, strideB);
+        if (q <= kChunk) a.EveryOtherOf(b, c, q);
+        else a.Gather(plan.twiddles, j0, count, 2 * strideB);
         const std::size_t o0 = P::Offset(j0), o1 = P::Offset(j0 + q), o2 = P::Offset(j0 + 2 * q),
                           o3 = P::Offset(j0 + 3 * q);
-        StagePairRun<E, F, kOut, kScale>(n / (4 * q), 4 * q, count, re + o0, im + o0, re + o1, im + o1, re + o2,
-                                         im + o2, re + o3, im + o3, a.re, a.im, b.re, b.im, c.re, c.im,
-                                         at(outRe, j0), at(outIm, j0), at(outRe, j0 + q), at(outIm, j0 + q),
-                                         at(outRe, j0 + 2 * q), at(outIm, j0 + 2 * q), at(outRe, j0 + 3 * q),
-                                         at(outIm, j0 + 3 * q), scale);
+        if constexpr (kOut == Output::kPairsInPlace) {
+            E partsRe[4][kChunk], partsIm[4][kChunk];
+            StagePairRun<E, F, Output::kSplitArrays, kScale>(
+                1, 4 * q, count, re + o0, im + o0, re + o1, im + o1, re + o2, im + o2, re + o3, im + o3, a.re, a.im,
+                b.re, b.im, c.re, c.im, partsRe[0], partsIm[0], partsRe[1], partsIm[1], partsRe[2], partsIm[2],
+                partsRe[3], partsIm[3], scale);
+            for (std::size_t m = 0; m < 4; ++m) InterleaveParts(count, partsRe[m], partsIm[m], re + 2 * (j0 + m * q));
+        } else {
+            StagePairRun<E, F, kOut, kScale>(n >> (s + 1), 4 * q, count, re + o0, im + o0, re + o1, im + o1,
+                                             re + o2, im + o2, re + o3, im + o3, a.re, a.im, b.re, b.im, c.re, c.im,
+                                             at(outRe, j0), at(outIm, j0), at(outRe, j0 + q), at(outIm, j0 + q),
+                                             at(outRe, j0 + 2 * q), at(outIm, j0 + 2 * q), at(outRe, j0 + 3 * q),
+                                             at(outIm, j0 + 3 * q), scale);
+        }
     }
 }
 
