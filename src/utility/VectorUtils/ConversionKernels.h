@@ -3,6 +3,8 @@
 #include <climits>
 #include <cmath>
 #include <cstddef>
+#include <cstdint>
+#include <cstring>
 
 #include <kestcore/utility/int24_t.h>
 
@@ -101,28 +103,41 @@ inline float LimitAndScale(float x, float m)
     return x >= 1.0f ? m : (x <= -1.0f ? -m : x * m);
 }
 
-// The limit and scale for multipliers up to 2^30 (every scale from -30 up),
-// the common case, in fewer vector operations. A source inside (-1, 1)
-// scales to less than 2^30 in magnitude, so its product converts without a
-// range test, and so does the product doubled: rounding half away from zero
-// is then trunc(2v) - trunc(v), since doubling is exact and trunc(2v) differs
-// from 2 trunc(v) by exactly one where the fraction reaches one half. Sources
-// at or beyond +-1 take the integers of +-m, fixed for the call; a NaN takes
-// kIndefinite, the indefinite value or, where the store keeps only the low
-// bits (all zero in it), plain 0, which spares a select.
+// The limit and scale in the common case, with every decision made on the
+// float before one conversion. A source inside (-1, 1) scales exactly by
+// the power of two `by`; one at or beyond +-1 becomes +-by; a NaN becomes
+// +0 and then kIndefinite: the indefinite value or, where the store keeps
+// only the low bits (all zero in it), plain 0, which drops its test. The
+// choice is made on the bit patterns, not by selects: with selects g++
+// converts both candidates and chooses between the integers, narrowed to
+// the destination's width, at twice the cost.
+//
+// Truncation takes by = m, rounding by = 2m: with t = trunc(2v), rounding v
+// half away from zero gives (t + 1) >> 1 for t > 0 and t >> 1 otherwise
+// (trunc(2v) is 2 trunc(v) plus one exactly where the fraction reaches one
+// half), from the one conversion and without the rounding mode. Doubling
+// is exact, so +-2m gives the integers of +-m, as the general path does.
+// |v| <= by must convert without a range test, hence by <= 2^30.
 template <bool kRound, int kIndefinite>
-inline int LimitAndScaleToInt32(float x, float m, int high, int low)
+inline int LimitAndScaleToInt32(float x, float by)
 {
     const float magnitude = std::fabs(x);
-    const bool inside = magnitude < 1.0f;
-    const float v = inside ? x * m : 0.0f;
-    const int scaled = kRound ? static_cast<int>(v + v) - static_cast<int>(v) : static_cast<int>(v);
-    const int limited = low ^ (x > 0.0f ? high ^ low : 0);
-    const int outside = magnitude >= 1.0f ? limited : kIndefinite;
-    return inside ? scaled : outside;
+    const std::uint32_t inside = 0u - static_cast<std::uint32_t>(magnitude < 1.0f);
+    const std::uint32_t beyond = 0u - static_cast<std::uint32_t>(magnitude >= 1.0f);
+    const float scaled = x * by;
+    const float limit = std::copysign(by, x);
+    std::uint32_t scaledBits, limitBits;
+    std::memcpy(&scaledBits, &scaled, sizeof scaledBits);
+    std::memcpy(&limitBits, &limit, sizeof limitBits);
+    const std::uint32_t chosenBits = (inside & scaledBits) | (beyond & limitBits);
+    float chosen;
+    std::memcpy(&chosen, &chosenBits, sizeof chosen);
+    const int t = static_cast<int>(chosen);
+    const int value = kRound ? (t + (t > 0 ? 1 : 0)) >> 1 : t;
+    return value | ((inside | beyond) != 0 ? 0 : kIndefinite);
 }
 
-constexpr float kShortPathMultiplier = 1073741824.0f;  // 2^30
+constexpr float kShortPathLimit = 1073741824.0f;  // 2^30
 
 template <class Dst>
 constexpr int kIndefiniteAfterStore = sizeof(Dst) <= sizeof(short) ? 0 : INT_MIN;
@@ -195,12 +210,10 @@ void FloatToIntegerUnscaled(unsigned int count, const float* src, Dst* dst)
 template <bool kRound, class Dst>
 void FloatToIntegerScaled(unsigned int count, const float* src, Dst* dst, float m)
 {
-    if (m <= kShortPathMultiplier) {
-        const int high = ToInt32<kRound>(m);
-        const int low = ToInt32<kRound>(-m);
-        StoreEach(count, src, dst, [=](float x) {
-            return LimitAndScaleToInt32<kRound, kIndefiniteAfterStore<Dst>>(x, m, high, low);
-        });
+    const float by = kRound ? m + m : m;
+    if (by <= kShortPathLimit) {
+        StoreEach(count, src, dst,
+                  [by](float x) { return LimitAndScaleToInt32<kRound, kIndefiniteAfterStore<Dst>>(x, by); });
     } else {
         StoreEach(count, src, dst, [m](float x) { return ToInt32<kRound>(LimitAndScale(x, m)); });
     }
