@@ -1,8 +1,7 @@
 #pragma once
 
-// Helpers of the FFT tests: the tolerance rule, a long-double direct DFT
-// that serves as the oracle, and traits that name the state types of each
-// precision.
+// FFT test helpers: the tolerance rule, a long-double direct DFT as the
+// oracle, and the state types of each precision.
 
 #include <kestaccel/FFT.h>
 
@@ -20,8 +19,7 @@ constexpr E Eps()
     return sizeof(E) == 4 ? E(1.0 / 8388608.0) : E(1.0 / 4503599627370496.0);
 }
 
-// a agrees with b at tolerance t when |a - b| is at most t eps, or at most
-// t eps times the larger magnitude.
+// Within t eps, absolutely or relative to the larger magnitude.
 template <class E>
 ::testing::AssertionResult Agrees(long double expected, E actual, double t)
 {
@@ -33,18 +31,16 @@ template <class E>
                                          << " (off by " << static_cast<double>(diff / Eps<E>()) << " eps)";
 }
 
-// Direct DFT in long double: X[k] = sum x[n] exp(-2 pi i k n / N), the sum
-// in ascending n; the factors come from one table of N angles.
+// X[k] = sum x[n] exp(-2 pi i k n / N) in long double, ascending n.
 inline std::vector<std::complex<long double>> DirectDFT(const std::vector<std::complex<long double>>& x)
 {
     const std::size_t n = x.size();
     const long double pi = 3.141592653589793238462643383279502884L;
-    std::vector<std::complex<long double>> factor(n);
+    std::vector<std::complex<long double>> factor(n), result(n);
     for (std::size_t m = 0; m < n; ++m) {
         const long double angle = -2.0L * pi * static_cast<long double>(m) / static_cast<long double>(n);
         factor[m] = {std::cos(angle), std::sin(angle)};
     }
-    std::vector<std::complex<long double>> result(n);
     for (std::size_t k = 0; k < n; ++k) {
         long double re = 0, im = 0;
         for (std::size_t i = 0; i < n; ++i) {
@@ -57,8 +53,7 @@ inline std::vector<std::complex<long double>> DirectDFT(const std::vector<std::c
     return result;
 }
 
-// exp(-2 pi i j / 8), j = 0 .. 7, as exact as the eighth roots can be
-// written: the quarter turns are exact.
+// exp(-2 pi i j / 8); the quarter turns are exact.
 inline std::complex<long double> EighthRoot(unsigned int j)
 {
     const long double h = 0.7071067811865476;  // the double nearest to sqrt(1/2)
@@ -81,7 +76,6 @@ struct States<double> {
     using Deinterleaved = kestaccel::FFTState_Complex_Double_Deinterleaved;
 };
 
-// Owns a state for the length of a test.
 template <class State>
 class StateHolder {
 public:
@@ -94,5 +88,16 @@ public:
 private:
     State* state_ = nullptr;
 };
+
+// FFTFwd or FFTInv on any layout.
+template <class State, class... Arrays>
+void Transform(bool inverse, State* state, Arrays... arrays)
+{
+    if (inverse) {
+        kestaccel::transform::FFTInv(arrays..., state, nullptr);
+    } else {
+        kestaccel::transform::FFTFwd(arrays..., state, nullptr);
+    }
+}
 
 }  // namespace fft_test

@@ -1,16 +1,15 @@
-// FFTImpl as a consumer of the shared library uses it: construction, the
-// length rounding, rebuilding, and its transforms against the free functions;
-// and the creation and release of the states underneath.
+// FFTImpl as a consumer uses it: the length rounding, rebuilding, its
+// transforms against the free functions; and the states' creation and release.
 
 #include <cstdint>
 #include <type_traits>
 #include <vector>
 
 #include "FFTTestSupport.h"
+#include "support/AllocationCount.h"
 
 namespace {
 
-using namespace kestaccel;
 using namespace kestaccel::transform;
 using kestaccel_test::SameBitsArray;
 
@@ -23,9 +22,8 @@ protected:
 using Elements = ::testing::Types<float, double>;
 TYPED_TEST_SUITE(FFTImplTyped, Elements);
 
-// The order rounds the length to the nearest power of two on a log scale.
-// A nonzero length given to the constructor wins over its order. Lengths 0
-// and 1 after a real one drop the state.
+// The order rounds the length on a log scale (724 -> 512, 725 -> 1024); a
+// nonzero length given to the constructor wins over its order.
 TYPED_TEST(FFTImplTyped, LengthTable)
 {
     typename TestFixture::Impl impl;
@@ -49,10 +47,8 @@ TYPED_TEST(FFTImplTyped, LengthTable)
     }
 }
 
-// ProcessFwd and ProcessInv run FFTFwd and FFTInv on the owned state: the
-// same bits as a deinterleaved state of the same order, also after the
-// state was dropped, after the length changes, and when it is set again
-// unchanged.
+// The bits of a deinterleaved state of the same order, also after the state
+// was dropped, resized, or set again unchanged.
 TYPED_TEST(FFTImplTyped, TransformsMatchFreeFunctions)
 {
     using E = TypeParam;
@@ -65,36 +61,41 @@ TYPED_TEST(FFTImplTyped, TransformsMatchFreeFunctions)
         SCOPED_TRACE(kestaccel_test::SeedTrace(seed) + ", length " + std::to_string(length));
         const auto re = kestaccel_test::RandomReals<E>(n, seed), im = kestaccel_test::RandomReals<E>(n, seed + 1);
         fft_test::StateHolder<typename TestFixture::State> state(impl.GetOrder());
-        std::vector<E> outRe(n), outIm(n), expectRe(n), expectIm(n);
-        impl.ProcessFwd(re.data(), im.data(), outRe.data(), outIm.data());
-        FFTFwd(re.data(), im.data(), expectRe.data(), expectIm.data(), state.get(), nullptr);
-        EXPECT_TRUE(SameBitsArray(expectRe, outRe));
-        EXPECT_TRUE(SameBitsArray(expectIm, outIm));
-        impl.ProcessInv(re.data(), im.data(), outRe.data(), outIm.data());
-        FFTInv(re.data(), im.data(), expectRe.data(), expectIm.data(), state.get(), nullptr);
-        EXPECT_TRUE(SameBitsArray(expectRe, outRe));
-        EXPECT_TRUE(SameBitsArray(expectIm, outIm));
+        for (bool inverse : {false, true}) {
+            std::vector<E> outRe(n), outIm(n), expectRe(n), expectIm(n);
+            if (inverse) {
+                impl.ProcessInv(re.data(), im.data(), outRe.data(), outIm.data());
+            } else {
+                impl.ProcessFwd(re.data(), im.data(), outRe.data(), outIm.data());
+            }
+            fft_test::Transform(inverse, state.get(), re.data(), im.data(), expectRe.data(), expectIm.data());
+            EXPECT_TRUE(SameBitsArray(expectRe, outRe) && SameBitsArray(expectIm, outIm)) << inverse;
+        }
     }
 }
 
 // Pointers: the state types are incomplete to a consumer.
 template <class StatePointer>
 class FFTState : public ::testing::Test {};
-using States = ::testing::Types<FFTState_Float*, FFTState_Double*, FFTState_Complex_Float_Interleaved*,
-                                FFTState_Complex_Double_Interleaved*, FFTState_Complex_Float_Deinterleaved*,
-                                FFTState_Complex_Double_Deinterleaved*>;
+using States = ::testing::Types<kestaccel::FFTState_Float*, kestaccel::FFTState_Double*,
+                                kestaccel::FFTState_Complex_Float_Interleaved*,
+                                kestaccel::FFTState_Complex_Double_Interleaved*,
+                                kestaccel::FFTState_Complex_Float_Deinterleaved*,
+                                kestaccel::FFTState_Complex_Double_Deinterleaved*>;
 TYPED_TEST_SUITE(FFTState, States);
 
-// Order 0 and null pointers are refused; the work-buffer query is vestigial.
+// Order 0 and null are refused; the work-buffer query always says 0; Free
+// gives back every block Init took.
 TYPED_TEST(FFTState, InitRefusesOrderZeroAndNull)
 {
     using State = std::remove_pointer_t<TypeParam>;
     State* const marker = reinterpret_cast<State*>(std::uintptr_t(0x1234560));
     State* state = marker;
     FFTInit(&state, 0);
-    EXPECT_EQ(state, marker) << "order 0 must leave the caller's variable alone";
-    FFTInit(static_cast<State**>(nullptr), 5);  // must simply return
+    EXPECT_EQ(state, marker);
+    FFTInit(static_cast<State**>(nullptr), 5);
     state = nullptr;
+    kestaccel_test::ResetAllocationTally();
     FFTInit(&state, 10);
     ASSERT_NE(state, nullptr);
     unsigned int size = 123;
@@ -105,6 +106,10 @@ TYPED_TEST(FFTState, InitRefusesOrderZeroAndNull)
     EXPECT_EQ(size, 0u);
     FFTFree(state);
     FFTFree(static_cast<State*>(nullptr));
+    const auto tally = kestaccel_test::CurrentAllocationTally();
+    if (kestaccel_test::LibraryAllocationsAreCounted()) {
+        EXPECT_EQ(tally.news, tally.deletes);
+    }
 }
 
 }  // namespace
