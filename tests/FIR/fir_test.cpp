@@ -1,10 +1,11 @@
-// FIR filter: the outputs and the delay line against a plain loop written
-// here, the block and chunk paths, the single-sample form, the setters, and
-// the refusal of impossible tap counts.
+// FIR filter: outputs and delay line against a plain loop, the block and
+// chunk paths, the single-sample form, the setters, impossible tap counts,
+// allocation, and a designed lowpass on tones.
 
 #include <kestaccel/FIR.h>
 
 #include <algorithm>
+#include <cmath>
 #include <cstdint>
 #include <stdexcept>
 #include <string>
@@ -19,8 +20,8 @@ using namespace kestaccel_test;
 namespace kf = kestaccel::filter;
 using Floats = std::vector<float>;
 
-// The filter as written down: one float sum per output from +0, taps[k] times
-// x[i - k] for k from the oldest sample (k = m) to the newest (k = 0).
+// One float sum per output from +0, taps[k] times x[i - k] from the oldest
+// sample (k = m) to the newest (k = 0).
 struct PlainFIR {
     Floats taps, history;  // history: the last m inputs, oldest first
 
@@ -42,7 +43,6 @@ struct PlainFIR {
     }
 };
 
-// A filter record released at the end of the scope.
 struct Filter {
     kestaccel::FIRState_Float* state = nullptr;
     Filter(const Floats& taps, const float* delayLine, bool nullTaps = false)
@@ -66,16 +66,9 @@ struct Filter {
     }
 };
 
-Floats Slice(const Floats& v, std::size_t at, std::size_t length)
-{
-    return Floats(v.begin() + static_cast<std::ptrdiff_t>(at), v.begin() + static_cast<std::ptrdiff_t>(at + length));
-}
-
-// The block form against the plain loop, bit for bit, over tap counts and
-// block lengths that reach the eight-output body, its remainder, blocks
-// shorter than the delay line and blocks that straddle its end. The
-// single-sample form gives the same bits and stores nothing: asked twice, it
-// sees the same history, and so does the block after it.
+// Tap counts and block lengths that reach the eight-output body, its
+// remainder, and blocks shorter than or straddling the delay line. The
+// single-sample form gives the same bits and stores nothing.
 TEST(FIR, BothFormsMatchThePlainLoop)
 {
     for (unsigned int taps : {1u, 2u, 3u, 8u, 9u, 17u, 64u, 256u}) {
@@ -94,14 +87,13 @@ TEST(FIR, BothFormsMatchThePlainLoop)
     }
 }
 
-// A stream cut into calls of any lengths (one 512 or two 256, uneven pieces,
-// empty ones) gives the bits of one plain pass: the delay line carries
-// exactly the history each call needs.
+// 512 samples in one call, in two of 256, and in uneven or empty pieces
+// give the bits of one plain pass.
 TEST(FIR, BlockSplitsMatchOnePass)
 {
     const std::vector<unsigned int> splits[] = {{512}, {256, 256}, {1, 3, 35, 36, 37, 8, 0, 600, 2, 1000, 1272}};
     for (const auto& split : splits) {
-        const std::uint32_t seed = split.size() > 2 ? 78 : 77;  // 512 and 256 + 256 on the same data
+        const std::uint32_t seed = split.size() > 2 ? 78 : 77;
         SCOPED_TRACE(SeedTrace(seed));
         PlainFIR plain{RandomReals<float>(37, seed), RandomReals<float>(36, seed + 1)};
         Filter filter(plain.taps, plain.history.data());
@@ -110,7 +102,7 @@ TEST(FIR, BlockSplitsMatchOnePass)
         const auto input = RandomReals<float>(total, seed + 2);
         Floats actual;
         for (unsigned int length : split) {
-            const auto out = filter.Run(Slice(input, at, length));
+            const auto out = filter.Run(Floats(input.begin() + at, input.begin() + at + length));
             actual.insert(actual.end(), out.begin(), out.end());
             at += length;
         }
@@ -119,10 +111,9 @@ TEST(FIR, BlockSplitsMatchOnePass)
     }
 }
 
-// Overlapping source and destination run in chunks of at most 512 samples,
-// each read whole from the buffer as it stands, then written at the
-// destination. Equal pointers so match separate buffers; a destination above
-// the source feeds outputs back as inputs once the block exceeds one chunk.
+// Overlapping buffers run in chunks of at most 512 samples, each read whole
+// before it is written: equal pointers match separate buffers (800 samples,
+// 5 taps); a destination above the source feeds outputs back as inputs.
 TEST(FIR, OverlapFollowsTheChunks)
 {
     struct Case {
@@ -140,7 +131,8 @@ TEST(FIR, OverlapFollowsTheChunks)
         GuardedBuffer<float> buffer(expected.size());
         std::copy(expected.begin(), expected.end(), buffer.data());
         for (std::size_t done = 0; done < c.count; done += 512) {
-            const auto out = plain.Run(Slice(expected, c.srcAt + done, std::min<std::size_t>(512, c.count - done)));
+            const auto from = expected.begin() + c.srcAt + done;
+            const auto out = plain.Run(Floats(from, from + std::min<std::size_t>(512, c.count - done)));
             std::copy(out.begin(), out.end(), expected.begin() + static_cast<std::ptrdiff_t>(c.dstAt + done));
         }
         kf::FIR(filter.state, static_cast<unsigned int>(c.count), buffer.data() + c.srcAt, buffer.data() + c.dstAt);
@@ -150,8 +142,7 @@ TEST(FIR, OverlapFollowsTheChunks)
     }
 }
 
-// Every sum starts at +0: negative taps on zero input give products of -0,
-// and every output, in the eight-output body as in the remainder, is +0.
+// Sums start at +0: negative taps on zeros give +0 in the body and the rest.
 TEST(FIR, NegativeZeroProductsSumToPositiveZero)
 {
     for (unsigned int tapCount : {1u, 5u, 12u}) {
@@ -162,8 +153,8 @@ TEST(FIR, NegativeZeroProductsSumToPositiveZero)
     }
 }
 
-// Null taps at creation leave every tap at zero until FIRSetTaps, which keeps
-// the delay line; a null delay line clears it. No work buffer exists.
+// Null taps leave zeros until FIRSetTaps, which keeps the delay line; a null
+// delay line clears it. No work buffer exists.
 TEST(FIR, SettersAndNullArguments)
 {
     const std::uint32_t seed = 43;
@@ -181,6 +172,8 @@ TEST(FIR, SettersAndNullArguments)
     for (unsigned int tapCount : {0u, 1u, 64u, 0xFFFFFFFFu}) EXPECT_EQ(0u, kf::FIRGetWorkBufferSize(tapCount));
 }
 
+// "vector too long", the caller's pointer untouched and nothing large or
+// leaked on the way.
 TEST(FIR, ImpossibleTapCountsThrowWithoutAllocatingMuch)
 {
     for (unsigned int tapCount : {0u, 0x80000000u, 0x80000001u, 0xFFFFFFFFu}) {
@@ -199,14 +192,13 @@ TEST(FIR, ImpossibleTapCountsThrowWithoutAllocatingMuch)
         EXPECT_EQ("vector too long", what);
         EXPECT_EQ(sentinel, state);
         if (LibraryAllocationsAreCounted()) {
-            EXPECT_EQ(tally.news, tally.deletes) << "the half-built record was not released";
+            EXPECT_EQ(tally.news, tally.deletes);
             EXPECT_LT(tally.largest, std::size_t(1) << 20);
         }
     }
 }
 
-// Filtering allocates nothing; Free gives back every block Init took, and
-// ignores null.
+// Filtering allocates nothing; Free gives back every block, and ignores null.
 TEST(FIR, AllocationOnlyAtInit)
 {
     KESTACCEL_REQUIRE_ALLOCATION_COUNTING();
@@ -223,6 +215,36 @@ TEST(FIR, AllocationOnlyAtInit)
     kf::FIRFree(state);
     kf::FIRFree(nullptr);
     EXPECT_EQ(CurrentAllocationTally().news, CurrentAllocationTally().deletes);
+}
+
+// A Hamming lowpass at 0.1 passes a low tone and attenuates tones above the
+// cutoff by what its taps' response predicts, measured over whole cycles
+// after the filter settles.
+TEST(FIR, LowpassPassesLowToneAndAttenuatesHighTone)
+{
+    const unsigned int tapCount = 101;
+    std::vector<double> design(tapCount);
+    kf::GenerateLowpassFIRCoefficients(0.1, tapCount, design.data(), kestaccel::utility::kDSPWindowHamming, true,
+                                       nullptr);
+    const Floats taps(design.begin(), design.end());
+    Filter filter(taps, nullptr);
+    const std::size_t settle = tapCount, span = 3000;
+    for (double f : {0.02, 0.25, 0.3}) {
+        SCOPED_TRACE(f);
+        Floats signal(settle + span);
+        for (std::size_t n = 0; n < signal.size(); ++n) signal[n] = float(std::sin(2.0 * kPi * f * double(n)));
+        kf::FIRSetDlyLine(filter.state, nullptr);
+        const auto out = filter.Run(signal);
+        const double measured = 20.0 * std::log10(2.0 * DtftMagnitude(out.data() + settle, span, f) / double(span));
+        const double predicted = 20.0 * std::log10(DtftMagnitude(taps.data(), tapCount, f));
+        if (f < 0.1) {
+            EXPECT_NEAR(0.0, predicted, 0.01);
+            EXPECT_NEAR(predicted, measured, 0.001);
+        } else {
+            EXPECT_LT(predicted, -60.0);  // well inside the Hamming stopband
+            EXPECT_NEAR(predicted, measured, 0.5);
+        }
+    }
 }
 
 }  // namespace
