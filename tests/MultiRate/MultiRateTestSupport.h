@@ -1,8 +1,8 @@
 #pragma once
 
-// A filter holder for the multi-rate tests, and the reference model written
-// from the definition: insert U - 1 zeros after every input sample, run one
-// FIR filter over the whole high-rate stream, keep every D-th output.
+// A multi-rate filter holder, and the model from the definition: U - 1 zeros
+// after every input sample, one FIR filter over the high-rate stream, every
+// D-th output kept.
 
 #include <kestaccel/MultiRate.h>
 
@@ -35,8 +35,8 @@ private:
         nullptr;
 };
 
-// One call of `cycles` into a guarded buffer pre-filled with 7, so that an
-// output left unwritten or written past the end shows.
+// One call into a guarded buffer pre-filled with 7, so that an output left
+// unwritten or written past the end shows.
 template <class T>
 std::vector<T> ProcessOnce(MultiRateFilter<T>& filter, unsigned int up, const T* src, unsigned int cycles)
 {
@@ -46,12 +46,10 @@ std::vector<T> ProcessOnce(MultiRateFilter<T>& filter, unsigned int up, const T*
     return out.values();
 }
 
-// `count` outputs at high-rate positions first, first + down, ... of the
-// stream x, where everything before x[0] is zero. Only the first
-// (tapCount / up) * up taps take part. Each sum runs over the zero-stuffed
-// stream from the oldest sample to the newest, zeros included: adding a zero
-// product never changes a sum that started at +0, so the polyphase filter,
-// which skips them, must give these very bits.
+// `count` outputs at high-rate positions first, first + down, ... of x, with
+// zeros before x[0]; only the first (tapCount / up) * up taps take part.
+// Each sum runs from the oldest sample to the newest, zeros included: a zero
+// product never changes a sum begun at +0, so skipping them gives these bits.
 template <class T>
 std::vector<T> ZeroStuffedOutputs(const std::vector<T>& x, const std::vector<T>& taps, unsigned int up,
                                   unsigned int down, std::int64_t first, std::size_t count)
