@@ -1,6 +1,8 @@
-// Complex and real transforms through the public interface: known spectra
-// at size 8, zeros, round trips, layouts and placements, the small orders,
-// accuracy against a long-double direct DFT, and allocation.
+// Transforms through the public interface: known spectra at size 8, zeros,
+// round trips, layouts and placements, the small orders, accuracy against a
+// long-double direct DFT, allocation; FFTImpl and the states' life cycle.
+
+#include <kestaccel/FFT.h>
 
 #include <algorithm>
 #include <cmath>
@@ -8,20 +10,95 @@
 #include <cstdint>
 #include <cstdio>
 #include <limits>
+#include <type_traits>
 #include <vector>
 
-#include "FFTTestSupport.h"
 #include "support/AllocationCount.h"
+#include "support/TestSupport.h"
 
 namespace {
 
-using fft_test::Agrees;
-using fft_test::StateHolder;
-using fft_test::Transform;
-using kestaccel_test::GuardedBuffer;
-using kestaccel_test::SameBits;
-using kestaccel_test::SameBitsArray;
-using kestaccel_test::SeedTrace;
+using namespace kestaccel::transform;
+using namespace kestaccel_test;
+
+// Within t eps, absolutely or relative to the larger magnitude.
+template <class E>
+::testing::AssertionResult Agrees(long double expected, E actual, double t)
+{
+    const long double diff = std::fabs(static_cast<long double>(actual) - expected);
+    const long double bound = t * static_cast<long double>(std::numeric_limits<E>::epsilon());
+    const long double larger = std::fmax(std::fabs(expected), std::fabs(static_cast<long double>(actual)));
+    if (diff <= bound || diff <= bound * larger) return ::testing::AssertionSuccess();
+    return ::testing::AssertionFailure() << "expected " << static_cast<double>(expected) << ", got " << actual
+                                         << " (off by " << static_cast<double>(diff / std::numeric_limits<E>::epsilon()) << " eps)";
+}
+
+// X[k] = sum x[n] exp(-2 pi i k n / N) in long double, ascending n.
+std::vector<std::complex<long double>> DirectDFT(const std::vector<std::complex<long double>>& x)
+{
+    const std::size_t n = x.size();
+    const long double pi = 3.141592653589793238462643383279502884L;
+    std::vector<std::complex<long double>> factor(n), result(n);
+    for (std::size_t m = 0; m < n; ++m) {
+        const long double angle = -2.0L * pi * static_cast<long double>(m) / static_cast<long double>(n);
+        factor[m] = {std::cos(angle), std::sin(angle)};
+    }
+    for (std::size_t k = 0; k < n; ++k) {
+        long double re = 0, im = 0;
+        for (std::size_t i = 0; i < n; ++i) {
+            const auto& w = factor[(k * i) % n];
+            re += x[i].real() * w.real() - x[i].imag() * w.imag();
+            im += x[i].real() * w.imag() + x[i].imag() * w.real();
+        }
+        result[k] = {re, im};
+    }
+    return result;
+}
+
+// exp(-2 pi i j / 8); the quarter turns are exact.
+std::complex<long double> EighthRoot(unsigned int j)
+{
+    const long double h = 0.7071067811865476;  // the double nearest to sqrt(1/2)
+    const std::complex<long double> roots[8] = {{1, 0}, {h, -h}, {0, -1}, {-h, -h}, {-1, 0}, {-h, h}, {0, 1}, {h, h}};
+    return roots[j % 8];
+}
+
+template <class E, class Real, class Interleaved, class Deinterleaved>
+struct StateTypes {
+    using R = Real;
+    using I = Interleaved;
+    using D = Deinterleaved;
+};
+template <class E>
+using States = std::conditional_t<sizeof(E) == 4,
+                                  StateTypes<E, kestaccel::FFTState_Float, kestaccel::FFTState_Complex_Float_Interleaved,
+                                             kestaccel::FFTState_Complex_Float_Deinterleaved>,
+                                  StateTypes<E, kestaccel::FFTState_Double, kestaccel::FFTState_Complex_Double_Interleaved,
+                                             kestaccel::FFTState_Complex_Double_Deinterleaved>>;
+
+template <class State>
+class StateHolder {
+public:
+    explicit StateHolder(unsigned int order) { FFTInit(&state_, order); }
+    ~StateHolder() { FFTFree(state_); }
+    StateHolder(const StateHolder&) = delete;
+    StateHolder& operator=(const StateHolder&) = delete;
+    State* get() const { return state_; }
+
+private:
+    State* state_ = nullptr;
+};
+
+// FFTFwd or FFTInv on any layout.
+template <class State, class... Arrays>
+void Transform(bool inverse, State* state, Arrays... arrays)
+{
+    if (inverse) {
+        FFTInv(arrays..., state, nullptr);
+    } else {
+        FFTFwd(arrays..., state, nullptr);
+    }
+}
 
 template <class E>
 std::vector<std::complex<E>> Pairs(const E* re, const E* im, std::size_t n)
@@ -34,9 +111,9 @@ std::vector<std::complex<E>> Pairs(const E* re, const E* im, std::size_t n)
 template <class E>
 class FFT : public ::testing::Test {
 protected:
-    using Real = typename fft_test::States<E>::Real;
-    using Interleaved = typename fft_test::States<E>::Interleaved;
-    using Deinterleaved = typename fft_test::States<E>::Deinterleaved;
+    using Real = typename States<E>::R;
+    using Interleaved = typename States<E>::I;
+    using Deinterleaved = typename States<E>::D;
 
     // Out of place into a guarded buffer, on a state of its own.
     static std::vector<std::complex<E>> Complex(unsigned int order, const std::vector<std::complex<E>>& x,
@@ -75,7 +152,7 @@ TYPED_TEST(FFT, KnownSpectraOfSizeEight)
         const auto spectrum = TestFixture::Complex(3, {x.begin(), x.end()});
         const auto real = TestFixture::RealRun(3, x);
         for (unsigned int k = 0; k < 8; ++k) {
-            const auto root = fft_test::EighthRoot(k * m);
+            const auto root = EighthRoot(k * m);
             EXPECT_TRUE(Agrees<E>(root.real(), spectrum[k].real(), 1)) << "bin " << k;
             EXPECT_TRUE(Agrees<E>(root.imag(), spectrum[k].imag(), 1)) << "bin " << k;
             if (k > 4) continue;
@@ -124,9 +201,9 @@ TYPED_TEST(FFT, ForwardThenInverseAtOrderEight)
     using E = TypeParam;
     const std::uint32_t seed = 31;
     SCOPED_TRACE(SeedTrace(seed));
-    const auto x = kestaccel_test::RandomComplex<E>(256, seed, E(0), E(1));
+    const auto x = RandomComplex<E>(256, seed, E(0), E(1));
     const auto back = TestFixture::Complex(8, TestFixture::Complex(8, x), true);
-    const auto samples = kestaccel_test::RandomReals<E>(256, seed + 1, E(0), E(1));
+    const auto samples = RandomReals<E>(256, seed + 1, E(0), E(1));
     StateHolder<typename TestFixture::Real> state(8);
     const auto spectrum = TestFixture::RealRun(8, samples, false, state.get());
     const auto realBack = TestFixture::RealRun(8, spectrum, true, state.get());
@@ -158,7 +235,7 @@ TYPED_TEST(FFT, LayoutsAndPlacementsAgreeBitForBit)
         const unsigned int n = 1u << order;
         const std::uint32_t seed = 40 + order;
         SCOPED_TRACE(SeedTrace(seed) + ", order " + std::to_string(order));
-        const auto re = kestaccel_test::RandomReals<E>(n, seed), im = kestaccel_test::RandomReals<E>(n, seed + 500);
+        const auto re = RandomReals<E>(n, seed), im = RandomReals<E>(n, seed + 500);
         const auto pairs = Pairs(re.data(), im.data(), n);
         StateHolder<typename TestFixture::Interleaved> inter(order);
         StateHolder<typename TestFixture::Deinterleaved> split(order);
@@ -232,19 +309,19 @@ TYPED_TEST(FFT, AccuracyAgainstDirectDFT)
         for (unsigned int order : {10u, 12u}) {
             const unsigned int n = 1u << order, bins = real ? n / 2 + 1 : n;
             const std::uint32_t seed = (real ? 2000 : 1000) + order;
-            SCOPED_TRACE(kestaccel_test::SeedTrace(seed) + ", N " + std::to_string(n) + (real ? ", real" : ", complex"));
+            SCOPED_TRACE(SeedTrace(seed) + ", N " + std::to_string(n) + (real ? ", real" : ", complex"));
             std::vector<std::complex<E>> x(n), spectrum(bins);
             if (real) {
-                const auto samples = kestaccel_test::RandomReals<E>(n, seed);
+                const auto samples = RandomReals<E>(n, seed);
                 std::copy(samples.begin(), samples.end(), x.begin());
                 StateHolder<typename TestFixture::Real> state(order);
                 Transform(false, state.get(), samples.data(), reinterpret_cast<E*>(spectrum.data()));
             } else {
-                x = kestaccel_test::RandomComplex<E>(n, seed);
+                x = RandomComplex<E>(n, seed);
                 StateHolder<typename TestFixture::Interleaved> state(order);
                 Transform(false, state.get(), x.data(), spectrum.data());
             }
-            const auto oracle = fft_test::DirectDFT(std::vector<std::complex<long double>>(x.begin(), x.end()));
+            const auto oracle = DirectDFT(std::vector<std::complex<long double>>(x.begin(), x.end()));
             long double errSquares = 0, refSquares = 0, worst = 0;
             for (unsigned int k = 0; k < bins; ++k) {
                 const long double err = std::abs(std::complex<long double>(spectrum[k]) - oracle[k]);
@@ -274,7 +351,7 @@ TYPED_TEST(FFT, TransformsAllocateNothing)
         StateHolder<typename TestFixture::Deinterleaved> split(order);
         std::vector<E> a(2 * n + 2, E(0.5)), b(2 * n + 2);
         std::vector<std::complex<E>> c(n, E(0.25)), d(n);
-        kestaccel_test::ResetAllocationTally();
+        ResetAllocationTally();
         for (bool inverse : {false, true}) {
             Transform(inverse, real.get(), a.data(), b.data());
             Transform(inverse, inter.get(), c.data(), d.data());
@@ -282,7 +359,98 @@ TYPED_TEST(FFT, TransformsAllocateNothing)
             Transform(inverse, split.get(), a.data(), a.data() + n, b.data(), b.data() + n);
             Transform(inverse, split.get(), a.data(), a.data() + n, a.data(), a.data() + n);
         }
-        EXPECT_EQ(0u, kestaccel_test::CurrentAllocationTally().news) << "order " << order;
+        EXPECT_EQ(0u, CurrentAllocationTally().news) << "order " << order;
+    }
+}
+
+// FFTImpl rounds the length on a log scale (724 -> 512, 725 -> 1024); a
+// nonzero length given to the constructor wins over its order.
+TYPED_TEST(FFT, ImplLengthTable)
+{
+    using Impl = FFTImpl<typename TestFixture::Deinterleaved, std::complex<TypeParam>>;
+    Impl impl;
+    EXPECT_EQ(impl.GetOrder(), 0u);
+    EXPECT_EQ(impl.GetFFTSize(), 0u);
+    EXPECT_EQ(impl.GetBlockSize(), 1u);
+    const struct {
+        unsigned int length, order, block;
+    } table[] = {{2, 1, 2},       {3, 2, 4},         {724, 9, 512}, {725, 10, 1024}, {1, 0, 1},
+                 {1000, 10, 1024}, {1024, 10, 1024}, {0, 0, 1},     {1, 0, 1}};
+    for (const auto& row : table) {
+        SCOPED_TRACE("length " + std::to_string(row.length));
+        impl.SetFFTSize(row.length);
+        EXPECT_EQ(impl.GetOrder(), row.order);
+        EXPECT_EQ(impl.GetBlockSize(), row.block);
+        EXPECT_EQ(impl.GetFFTSize(), row.length);
+        Impl constructed(7, row.length);
+        EXPECT_EQ(constructed.GetOrder(), row.length == 0 ? 7u : row.order);
+        EXPECT_EQ(constructed.GetBlockSize(), row.length == 0 ? 128u : row.block);
+        EXPECT_EQ(constructed.GetFFTSize(), row.length);
+    }
+}
+
+// FFTImpl gives the bits of a deinterleaved state of the same order, also
+// after its state was dropped, resized, or set again unchanged.
+TYPED_TEST(FFT, ImplTransformsMatchFreeFunctions)
+{
+    using E = TypeParam;
+    FFTImpl<typename TestFixture::Deinterleaved, std::complex<E>> impl(0, 8);
+    impl.SetFFTSize(1);
+    for (unsigned int length : {100u, 100u, 1024u, 16u}) {
+        impl.SetFFTSize(length);
+        const unsigned int n = impl.GetBlockSize();
+        const std::uint32_t seed = 90 + length;
+        SCOPED_TRACE(SeedTrace(seed) + ", length " + std::to_string(length));
+        const auto re = RandomReals<E>(n, seed), im = RandomReals<E>(n, seed + 1);
+        StateHolder<typename TestFixture::Deinterleaved> state(impl.GetOrder());
+        for (bool inverse : {false, true}) {
+            std::vector<E> outRe(n), outIm(n), expectRe(n), expectIm(n);
+            if (inverse) {
+                impl.ProcessInv(re.data(), im.data(), outRe.data(), outIm.data());
+            } else {
+                impl.ProcessFwd(re.data(), im.data(), outRe.data(), outIm.data());
+            }
+            Transform(inverse, state.get(), re.data(), im.data(), expectRe.data(), expectIm.data());
+            EXPECT_TRUE(SameBitsArray(expectRe, outRe) && SameBitsArray(expectIm, outIm)) << inverse;
+        }
+    }
+}
+
+// Pointers: the state types are incomplete to a consumer.
+template <class StatePointer>
+class FFTState : public ::testing::Test {};
+using StatePointers = ::testing::Types<kestaccel::FFTState_Float*, kestaccel::FFTState_Double*,
+                                kestaccel::FFTState_Complex_Float_Interleaved*,
+                                kestaccel::FFTState_Complex_Double_Interleaved*,
+                                kestaccel::FFTState_Complex_Float_Deinterleaved*,
+                                kestaccel::FFTState_Complex_Double_Deinterleaved*>;
+TYPED_TEST_SUITE(FFTState, StatePointers);
+
+// Order 0 and null are refused; the work-buffer query always says 0; Free
+// gives back every block Init took.
+TYPED_TEST(FFTState, InitRefusesOrderZeroAndNull)
+{
+    using State = std::remove_pointer_t<TypeParam>;
+    State* const marker = reinterpret_cast<State*>(std::uintptr_t(0x1234560));
+    State* state = marker;
+    FFTInit(&state, 0);
+    EXPECT_EQ(state, marker);
+    FFTInit(static_cast<State**>(nullptr), 5);
+    state = nullptr;
+    ResetAllocationTally();
+    FFTInit(&state, 10);
+    ASSERT_NE(state, nullptr);
+    unsigned int size = 123;
+    FFTGetBufSize(state, &size);
+    EXPECT_EQ(size, 0u);
+    size = 123;
+    FFTGetBufSize(static_cast<const State*>(nullptr), &size);
+    EXPECT_EQ(size, 0u);
+    FFTFree(state);
+    FFTFree(static_cast<State*>(nullptr));
+    const auto tally = CurrentAllocationTally();
+    if (LibraryAllocationsAreCounted()) {
+        EXPECT_EQ(tally.news, tally.deletes);
     }
 }
 
