@@ -1,6 +1,5 @@
-// IIR filter: the recursion against a plain transposed-form loop, the block
-// paths against the single-sample form, the init calls' normalisation, the
-// setters and null cases, allocation, and a lowpass on a tone.
+// IIR filter: every form against a plain transposed-form loop, the init
+// calls' normalisation, setters and null cases, allocation, a lowpass on a tone.
 
 #include <kestaccel/IIR.h>
 
@@ -24,8 +23,7 @@ template <class T>
 using StateOf =
     std::conditional_t<std::is_same<T, float>::value, kestaccel::IIRState_Float, kestaccel::IIRState_Double>;
 
-// On taps already divided by a0: y = b0 x + d0; d[i] = (b[i+1] x + d[i+1])
-// - a[i+1] y; d[last] = b[order] x - a[order] y.
+// On taps already divided by a0, each operation rounded in this order.
 template <class T>
 struct PlainCascade {
     unsigned int order;
@@ -35,19 +33,11 @@ struct PlainCascade {
     T Step(T x)
     {
         for (std::size_t s = 0; s < state.size() / order; ++s) {
-            const T* b = &taps[s * (2 * order + 2)];
-            const T* a = b + order + 1;
+            const T *b = &taps[s * (2 * order + 2)], *a = b + order + 1;
             T* d = &state[s * order];
-            const T y = T(b[0] * x) + d[0];
-            for (std::size_t i = 0; i + 1 < order; ++i) {
-                const T bx = b[i + 1] * x;
-                const T withState = bx + d[i + 1];
-                const T ay = a[i + 1] * y;
-                d[i] = withState - ay;
-            }
-            const T bx = b[order] * x;
-            const T ay = a[order] * y;
-            d[order - 1] = bx - ay;
+            const T y = b[0] * x + d[0];
+            for (std::size_t i = 0; i + 1 < order; ++i) d[i] = (b[i + 1] * x + d[i + 1]) - a[i + 1] * y;
+            d[order - 1] = b[order] * x - a[order] * y;
             x = y;
         }
         return x;
