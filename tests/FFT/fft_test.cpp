@@ -63,30 +63,14 @@ std::complex<long double> EighthRoot(unsigned int j)
     return roots[j % 8];
 }
 
-template <class E, class Real, class Interleaved, class Deinterleaved>
-struct StateTypes {
-    using R = Real;
-    using I = Interleaved;
-    using D = Deinterleaved;
-};
-template <class E>
-using States = std::conditional_t<sizeof(E) == 4,
-                                  StateTypes<E, kestaccel::FFTState_Float, kestaccel::FFTState_Complex_Float_Interleaved,
-                                             kestaccel::FFTState_Complex_Float_Deinterleaved>,
-                                  StateTypes<E, kestaccel::FFTState_Double, kestaccel::FFTState_Complex_Double_Interleaved,
-                                             kestaccel::FFTState_Complex_Double_Deinterleaved>>;
-
+// Owns a state for the length of a test.
 template <class State>
-class StateHolder {
-public:
-    explicit StateHolder(unsigned int order) { FFTInit(&state_, order); }
-    ~StateHolder() { FFTFree(state_); }
+struct StateHolder {
+    State* state = nullptr;
+    explicit StateHolder(unsigned int order) { FFTInit(&state, order); }
     StateHolder(const StateHolder&) = delete;
-    StateHolder& operator=(const StateHolder&) = delete;
-    State* get() const { return state_; }
-
-private:
-    State* state_ = nullptr;
+    ~StateHolder() { FFTFree(state); }
+    State* get() const { return state; }
 };
 
 // FFTFwd or FFTInv on any layout.
@@ -111,9 +95,12 @@ std::vector<std::complex<E>> Pairs(const E* re, const E* im, std::size_t n)
 template <class E>
 class FFT : public ::testing::Test {
 protected:
-    using Real = typename States<E>::R;
-    using Interleaved = typename States<E>::I;
-    using Deinterleaved = typename States<E>::D;
+    static constexpr bool kFloat = sizeof(E) == 4;
+    using Real = std::conditional_t<kFloat, kestaccel::FFTState_Float, kestaccel::FFTState_Double>;
+    using Interleaved = std::conditional_t<kFloat, kestaccel::FFTState_Complex_Float_Interleaved,
+                                           kestaccel::FFTState_Complex_Double_Interleaved>;
+    using Deinterleaved = std::conditional_t<kFloat, kestaccel::FFTState_Complex_Float_Deinterleaved,
+                                             kestaccel::FFTState_Complex_Double_Deinterleaved>;
 
     // Out of place into a guarded buffer, on a state of its own.
     static std::vector<std::complex<E>> Complex(unsigned int order, const std::vector<std::complex<E>>& x,
@@ -140,8 +127,8 @@ protected:
 using Elements = ::testing::Types<float, double>;
 TYPED_TEST_SUITE(FFT, Elements);
 
-// Impulses within 1 eps (the real spectrum exactly real at DC and Nyquist,
-// and back to the impulse); a step within 2 eps, complex and real.
+// Impulses within 1 eps (the real spectrum exactly real at DC and Nyquist)
+// and a step within 2 eps, complex and real.
 TYPED_TEST(FFT, KnownSpectraOfSizeEight)
 {
     using E = TypeParam;
@@ -160,8 +147,6 @@ TYPED_TEST(FFT, KnownSpectraOfSizeEight)
             EXPECT_TRUE(Agrees<E>(root.imag(), real[2 * k + 1], 1)) << "real, bin " << k;
         }
         EXPECT_TRUE(SameBits(E(0), real[1]) && SameBits(E(0), real[9]));
-        const auto back = TestFixture::RealRun(3, real, true);
-        for (unsigned int n = 0; n < 8; ++n) EXPECT_TRUE(Agrees<E>(n == m ? 1 : 0, back[n], 1)) << n;
     }
     const long double r2 = 2.414213562373095, r0 = 0.41421356237309515;
     const long double re[8] = {4, -1, 0, -1, 0, -1, 0, -1}, im[8] = {0, r2, 0, r0, 0, -r0, 0, -r2};
@@ -174,9 +159,6 @@ TYPED_TEST(FFT, KnownSpectraOfSizeEight)
             EXPECT_TRUE(Agrees<E>(re[k], real[2 * k], 2) && Agrees<E>(im[k], real[2 * k + 1], 2)) << k;
         }
     }
-    const long double shifted[10] = {4, 0, -r2, -1, 0, 0, r0, 1, 0, 0};
-    const auto other = TestFixture::RealRun(3, {0, 0, 1, 1, 1, 1, 0, 0});
-    for (unsigned int i = 0; i < 10; ++i) EXPECT_TRUE(Agrees<E>(shifted[i], other[i], 2)) << i;
 }
 
 // Compared by value: a zero may come out as -0.
@@ -297,7 +279,6 @@ TYPED_TEST(FFT, OrdersOneThirtyTwoAndThirtyThree)
     }
 }
 
-
 // N = 1024 and 4096 on data in [-1, 1): RMS and worst error relative to the
 // oracle's RMS, printed; the bounds sit a few times above what the method
 // reaches (the twiddle drift dominates in double), far below a wrong factor.
@@ -330,8 +311,7 @@ TYPED_TEST(FFT, AccuracyAgainstDirectDFT)
                 worst = std::fmax(worst, err);
             }
             const long double refRms = std::sqrt(refSquares / bins);
-            const double rms = static_cast<double>(std::sqrt(errSquares / bins) / refRms);
-            const double max = static_cast<double>(worst / refRms);
+            const double rms = double(std::sqrt(errSquares / bins) / refRms), max = double(worst / refRms);
             std::printf("%s %s N=%u: rms %.3g, max %.3g\n", real ? "real" : "complex", sizeof(E) == 4 ? "float" : "double", n, rms, max);
             EXPECT_LT(rms, rmsBound);
             EXPECT_LT(max, maxBound);
@@ -350,32 +330,33 @@ TYPED_TEST(FFT, TransformsAllocateNothing)
         StateHolder<typename TestFixture::Interleaved> inter(order);
         StateHolder<typename TestFixture::Deinterleaved> split(order);
         std::vector<E> a(2 * n + 2, E(0.5)), b(2 * n + 2);
-        std::vector<std::complex<E>> c(n, E(0.25)), d(n);
         ResetAllocationTally();
         for (bool inverse : {false, true}) {
             Transform(inverse, real.get(), a.data(), b.data());
-            Transform(inverse, inter.get(), c.data(), d.data());
-            Transform(inverse, inter.get(), c.data(), c.data());
+            Transform(inverse, inter.get(), reinterpret_cast<std::complex<E>*>(a.data()),
+                      reinterpret_cast<std::complex<E>*>(a.data()));
             Transform(inverse, split.get(), a.data(), a.data() + n, b.data(), b.data() + n);
-            Transform(inverse, split.get(), a.data(), a.data() + n, a.data(), a.data() + n);
         }
         EXPECT_EQ(0u, CurrentAllocationTally().news) << "order " << order;
     }
 }
 
 // FFTImpl rounds the length on a log scale (724 -> 512, 725 -> 1024); a
-// nonzero length given to the constructor wins over its order.
-TYPED_TEST(FFT, ImplLengthTable)
+// nonzero length given to the constructor wins over its order. Its
+// transforms give the bits of a deinterleaved state of its order, also after
+// its state was dropped, rebuilt, or set again unchanged.
+TYPED_TEST(FFT, ImplLengthsAndTransforms)
 {
-    using Impl = FFTImpl<typename TestFixture::Deinterleaved, std::complex<TypeParam>>;
+    using E = TypeParam;
+    using Impl = FFTImpl<typename TestFixture::Deinterleaved, std::complex<E>>;
     Impl impl;
     EXPECT_EQ(impl.GetOrder(), 0u);
     EXPECT_EQ(impl.GetFFTSize(), 0u);
     EXPECT_EQ(impl.GetBlockSize(), 1u);
     const struct {
         unsigned int length, order, block;
-    } table[] = {{2, 1, 2},       {3, 2, 4},         {724, 9, 512}, {725, 10, 1024}, {1, 0, 1},
-                 {1000, 10, 1024}, {1024, 10, 1024}, {0, 0, 1},     {1, 0, 1}};
+    } table[] = {{2, 1, 2},        {3, 2, 4},         {724, 9, 512},     {725, 10, 1024}, {1, 0, 1},
+                 {1000, 10, 1024}, {1024, 10, 1024}, {1024, 10, 1024}, {0, 0, 1},       {1, 0, 1}};
     for (const auto& row : table) {
         SCOPED_TRACE("length " + std::to_string(row.length));
         impl.SetFFTSize(row.length);
@@ -386,23 +367,10 @@ TYPED_TEST(FFT, ImplLengthTable)
         EXPECT_EQ(constructed.GetOrder(), row.length == 0 ? 7u : row.order);
         EXPECT_EQ(constructed.GetBlockSize(), row.length == 0 ? 128u : row.block);
         EXPECT_EQ(constructed.GetFFTSize(), row.length);
-    }
-}
-
-// FFTImpl gives the bits of a deinterleaved state of the same order, also
-// after its state was dropped, resized, or set again unchanged.
-TYPED_TEST(FFT, ImplTransformsMatchFreeFunctions)
-{
-    using E = TypeParam;
-    FFTImpl<typename TestFixture::Deinterleaved, std::complex<E>> impl(0, 8);
-    impl.SetFFTSize(1);
-    for (unsigned int length : {100u, 100u, 1024u, 16u}) {
-        impl.SetFFTSize(length);
-        const unsigned int n = impl.GetBlockSize();
-        const std::uint32_t seed = 90 + length;
-        SCOPED_TRACE(SeedTrace(seed) + ", length " + std::to_string(length));
-        const auto re = RandomReals<E>(n, seed), im = RandomReals<E>(n, seed + 1);
-        StateHolder<typename TestFixture::Deinterleaved> state(impl.GetOrder());
+        if (row.order == 0) continue;
+        const unsigned int n = row.block;
+        const auto re = RandomReals<E>(n, 90 + row.length), im = RandomReals<E>(n, 91 + row.length);
+        StateHolder<typename TestFixture::Deinterleaved> state(row.order);
         for (bool inverse : {false, true}) {
             std::vector<E> outRe(n), outIm(n), expectRe(n), expectIm(n);
             if (inverse) {
@@ -416,21 +384,11 @@ TYPED_TEST(FFT, ImplTransformsMatchFreeFunctions)
     }
 }
 
-// Pointers: the state types are incomplete to a consumer.
-template <class StatePointer>
-class FFTState : public ::testing::Test {};
-using StatePointers = ::testing::Types<kestaccel::FFTState_Float*, kestaccel::FFTState_Double*,
-                                kestaccel::FFTState_Complex_Float_Interleaved*,
-                                kestaccel::FFTState_Complex_Double_Interleaved*,
-                                kestaccel::FFTState_Complex_Float_Deinterleaved*,
-                                kestaccel::FFTState_Complex_Double_Deinterleaved*>;
-TYPED_TEST_SUITE(FFTState, StatePointers);
-
-// Order 0 and null are refused; the work-buffer query always says 0; Free
-// gives back every block Init took.
-TYPED_TEST(FFTState, InitRefusesOrderZeroAndNull)
+// Order 0 and null are refused; the work-buffer query says 0; Free gives
+// back every block Init took.
+template <class State>
+void ExpectStateLifeCycle()
 {
-    using State = std::remove_pointer_t<TypeParam>;
     State* const marker = reinterpret_cast<State*>(std::uintptr_t(0x1234560));
     State* state = marker;
     FFTInit(&state, 0);
@@ -440,18 +398,21 @@ TYPED_TEST(FFTState, InitRefusesOrderZeroAndNull)
     ResetAllocationTally();
     FFTInit(&state, 10);
     ASSERT_NE(state, nullptr);
-    unsigned int size = 123;
+    unsigned int size = 123, none = 123;
     FFTGetBufSize(state, &size);
-    EXPECT_EQ(size, 0u);
-    size = 123;
-    FFTGetBufSize(static_cast<const State*>(nullptr), &size);
-    EXPECT_EQ(size, 0u);
+    FFTGetBufSize(static_cast<const State*>(nullptr), &none);
+    EXPECT_EQ(0u, size + none);
     FFTFree(state);
     FFTFree(static_cast<State*>(nullptr));
     const auto tally = CurrentAllocationTally();
-    if (LibraryAllocationsAreCounted()) {
-        EXPECT_EQ(tally.news, tally.deletes);
-    }
+    EXPECT_TRUE(!LibraryAllocationsAreCounted() || tally.news == tally.deletes);
+}
+
+TYPED_TEST(FFT, StatesLifeCycle)
+{
+    ExpectStateLifeCycle<typename TestFixture::Real>();
+    ExpectStateLifeCycle<typename TestFixture::Interleaved>();
+    ExpectStateLifeCycle<typename TestFixture::Deinterleaved>();
 }
 
 }  // namespace
