@@ -121,18 +121,6 @@ TYPED_TEST(CosineWindow, MatchesClosedFormulaBitForBit)
     }
 }
 
-// By hand: n = 2 uses the first factor for both samples; the triangle is
-// exactly 0 at the ends and 1 at the centre.
-TYPED_TEST(CosineWindow, HandWorkedValues)
-{
-    using T = TypeParam;
-    const T p = K<T>::C054() - K<T>::C046();
-    EXPECT_TRUE(SameBitsArray({T(0), T(0)}, OnesWindow(Hann, 2, T(0))));
-    EXPECT_TRUE(SameBitsArray({p, p}, OnesWindow(Hamming, 2, T(0))));
-    const std::vector<T> triangle = {0, T(0.25), T(0.5), T(0.75), 1, T(0.75), T(0.5), T(0.25), 0};
-    EXPECT_TRUE(SameBitsArray(triangle, OnesWindow(Bartlett, 9, T(0))));
-}
-
 double ReferenceI0(double x)
 {
     if (x == 0.0) return 1.0;
@@ -176,14 +164,12 @@ template <class T>
 class KaiserWindow : public ::testing::Test {};
 TYPED_TEST_SUITE(KaiserWindow, ElementTypes);
 
-// Out of place and in place; in double some odd centres have a factor
-// I0(t) * (1 / I0(t)) other than 1, so a second multiplication would show.
-// alpha = 0, and n = 1 whatever alpha, copy the source (-0 and NaN too);
-// n = 0 writes nothing; the window of ones is symmetric.
+// Out of place and in place, where an odd centre (a factor near 1, not
+// always 1 in double) is multiplied once. alpha = 0, and n = 1, copy the
+// source (-0 and NaN too); n = 0 writes nothing; the window of ones is symmetric.
 TYPED_TEST(KaiserWindow, MatchesPlainEvaluationBitForBit)
 {
     using T = TypeParam;
-    unsigned int centreNotOne = 0;
     for (unsigned int n : {0u, 1u, 2u, 3u, 4u, 5u, 8u, 9u, 16u, 31u, 64u, 65u, 256u, 1001u}) {
         // alpha * (n - 1) / 2 from 0 to 12, and negative.
         for (double beta : {0.0, 0.5, 1.3, 2.2, 4.0, 7.4, 12.0, -6.0, -3.7}) {
@@ -202,14 +188,10 @@ TYPED_TEST(KaiserWindow, MatchesPlainEvaluationBitForBit)
             auto data = src;
             ku::WindowKaiser(n, data.data(), data.data(), alpha);
             EXPECT_TRUE(SameBitsArray(Expected(n, src, alpha), data));
-            centreNotOne += n % 2 == 1 && Bits(KaiserFactor(n / 2, n, alpha)) != Bits(T(1));
             std::vector<T> w(n, T(1));
             ku::WindowKaiser(n, w.data(), w.data(), alpha);
             for (unsigned int i = 0; i < n / 2; ++i) ASSERT_TRUE(SameBits(w[i], w[n - 1 - i])) << "at " << i;
         }
-    }
-    if (sizeof(T) == 8) {
-        EXPECT_GE(centreNotOne, 10u);
     }
 }
 
