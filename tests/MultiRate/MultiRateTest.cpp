@@ -23,8 +23,9 @@ template <class T>
 using PoolVector = std::vector<T, kestcore::allocator::STLAllocator<T>>;
 
 template <class T>
-class MultiRateFilter {
-public:
+struct MultiRateFilter {
+    std::conditional_t<std::is_same<T, float>::value, kestaccel::MRFState_Float, kestaccel::MRFState_Double>* state_ =
+        nullptr;
     MultiRateFilter(unsigned int up, unsigned int down, const std::vector<T>& taps, unsigned int referencePosition,
                     unsigned int startPosition, const PoolVector<T>& reserved = PoolVector<T>())
     {
@@ -34,14 +35,9 @@ public:
     ~MultiRateFilter() { kestaccel::filter::MRFFree(state_); }
     MultiRateFilter(const MultiRateFilter&) = delete;
     void Process(const T* src, T* dst, unsigned int cycles) { kestaccel::filter::MRFProcess(src, dst, cycles, state_); }
-
-private:
-    std::conditional_t<std::is_same<T, float>::value, kestaccel::MRFState_Float, kestaccel::MRFState_Double>* state_ =
-        nullptr;
 };
 
-// One call into a guarded buffer pre-filled with 7, so that an output left
-// unwritten or written past the end shows.
+// Pre-filled with 7: an output left unwritten or written past the end shows.
 template <class T>
 std::vector<T> ProcessOnce(MultiRateFilter<T>& filter, unsigned int up, const T* src, unsigned int cycles)
 {
@@ -51,10 +47,9 @@ std::vector<T> ProcessOnce(MultiRateFilter<T>& filter, unsigned int up, const T*
     return out.values();
 }
 
-// `count` outputs at high-rate positions first, first + down, ... of x, with
-// zeros before x[0]; only the first (tapCount / up) * up taps take part.
-// Each sum runs from the oldest sample to the newest, zeros included: a zero
-// product never changes a sum begun at +0, so skipping them gives these bits.
+// Outputs at high-rate positions first, first + down, ... of x, zeros before
+// x[0], with the first (tapCount / up) * up taps; each sum from the oldest
+// sample, zeros included, which never change a sum begun at +0.
 template <class T>
 std::vector<T> ZeroStuffedOutputs(const std::vector<T>& x, const std::vector<T>& taps, unsigned int up,
                                   unsigned int down, std::int64_t first, std::size_t count)
@@ -227,9 +222,8 @@ TYPED_TEST(MultiRate, HandWorkedZerosAndImpulse)
     EXPECT_TRUE(SameBitsArray(taps, ProcessOnce(filter, 1, impulse.data(), 20)));
 }
 
-// U = 147, D = 160, 32 taps per branch from a Blackman-windowed sinc at 20
-// kHz with gain U: a 1 kHz tone keeps its amplitude, the error stays below
-// the design's passband deviation (98.6 dB measured in both types).
+// 48 kHz to 44.1 kHz through a Blackman-windowed sinc at 20 kHz, 32 taps per
+// branch, gain U: a 1 kHz tone comes through (98.6 dB SNR measured, both types).
 TYPED_TEST(MultiRate, KeepsAOneKilohertzToneFrom48000To44100)
 {
     using T = TypeParam;
@@ -250,8 +244,7 @@ TYPED_TEST(MultiRate, KeepsAOneKilohertzToneFrom48000To44100)
     MultiRateFilter<T> filter(up, down, taps, 0, 0);
     const auto y = ProcessOnce(filter, up, x.data(), cycles);
 
-    // Output n lies at high-rate position n * D, delayed by (T - 1) / 2;
-    // the outputs that still see the zeros before the first sample are skipped.
+    // Output n lies at n * D, delayed by (T - 1) / 2; skip those still seeing zeros.
     double signal = 0.0, noise = 0.0;
     for (std::size_t n = tapCount / down + 1; n < y.size(); ++n) {
         const double t = (double(n) * down - 0.5 * double(tapCount - 1)) / highRate;
