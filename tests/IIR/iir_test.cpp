@@ -3,14 +3,6 @@
 
 #include <kestaccel/IIR.h>
 
-#include <algorithm>
-#include <cmath>
-#include <complex>
-#include <cstdint>
-#include <limits>
-#include <type_traits>
-#include <vector>
-
 #include "support/AllocationCount.h"
 #include "support/TestSupport.h"
 
@@ -102,9 +94,8 @@ TYPED_TEST(IIRFilter, KnownFirstOutputs)
     kf::IIRFree(cascade);
 }
 
-// Single-sample, block and in-place forms against the plain recursion, bit
-// for bit, with the states they leave. Biquad sections have different a0:
-// all are scaled by the first one's reciprocal.
+// Single-sample, block and in-place forms and the states they leave, bit for
+// bit; every biquad section is scaled by the first one's 1 / a0.
 TYPED_TEST(IIRFilter, AllFormsMatchThePlainRecursion)
 {
     using T = TypeParam;
@@ -120,26 +111,22 @@ TYPED_TEST(IIRFilter, AllFormsMatchThePlainRecursion)
             for (unsigned int s = 1; s < shape.sections; ++s) taps[6 * s + 3] = T(0.5) + T(s);
             const auto initial = RandomReals<T>(states, seed + 1, T(-0.5), T(0.5));
             const auto input = RandomReals<T>(count, seed + 2);
-            StateOf<T>* single = Create<T>(shape.order, shape.sections, taps, initial.data());
-            StateOf<T>* block = Create<T>(shape.order, shape.sections, taps, initial.data());
-            StateOf<T>* inPlace = Create<T>(shape.order, shape.sections, taps, initial.data());
-
+            StateOf<T>* states3[3];
+            for (auto& state : states3) state = Create<T>(shape.order, shape.sections, taps, initial.data());
             std::vector<T> scaled(taps.size()), expected(count), singles(count);
             const T r = T(1) / taps[shape.order + 1];
             for (std::size_t i = 0; i < taps.size(); ++i) scaled[i] = r * taps[i];
             PlainCascade<T> plain{shape.order, scaled, initial};
             for (unsigned int i = 0; i < count; ++i) expected[i] = plain.Step(input[i]);
-            for (unsigned int i = 0; i < count; ++i) singles[i] = kf::IIR(input[i], single);
+            for (unsigned int i = 0; i < count; ++i) singles[i] = kf::IIR(input[i], states3[0]);
             GuardedBuffer<T> out(count), buffer(count);
             std::copy(input.begin(), input.end(), buffer.data());
-            kf::IIR(count, input.data(), out.data(), block);
-            kf::IIR_InPlace(count, buffer.data(), inPlace);
-
-            EXPECT_TRUE(out.Intact() && buffer.Intact());
+            kf::IIR(count, input.data(), out.data(), states3[1]);
+            kf::IIR_InPlace(count, buffer.data(), states3[2]);
             EXPECT_TRUE(SameBitsArray(expected, singles));
-            EXPECT_TRUE(SameBitsArray(expected, out.values()));
-            EXPECT_TRUE(SameBitsArray(expected, buffer.values()));
-            for (StateOf<T>* state : {single, block, inPlace}) {
+            EXPECT_TRUE(SameBitsArray(expected, out.values()) && out.Intact());
+            EXPECT_TRUE(SameBitsArray(expected, buffer.values()) && buffer.Intact());
+            for (StateOf<T>* state : states3) {
                 EXPECT_TRUE(SameBitsArray(plain.state, DelayLine<T>(state, states)));
                 kf::IIRFree(state);
             }
@@ -156,12 +143,13 @@ TYPED_TEST(IIRFilter, SettersAndNullCases)
     using State = StateOf<T>;
     const auto taps = RandomSections<T>(2, 3, T(1), 81);
     const auto initial = RandomReals<T>(6, 82), other = RandomReals<T>(6, 83);
-    State* state = reinterpret_cast<State*>(static_cast<std::uintptr_t>(0x4321));
+    State* const marker = reinterpret_cast<State*>(static_cast<std::uintptr_t>(0x4321));
+    State* state = marker;
     kf::IIRInit(&state, static_cast<const T*>(nullptr), 2, nullptr);
     kf::IIRInit(&state, taps.data(), 0, nullptr);
     kf::IIRInit_BiQuad(&state, static_cast<const T*>(nullptr), 1, nullptr);
     kf::IIRInit_BiQuad(&state, taps.data(), 0, nullptr);
-    EXPECT_EQ(reinterpret_cast<State*>(static_cast<std::uintptr_t>(0x4321)), state);
+    EXPECT_EQ(marker, state);
     kf::IIRInit(static_cast<State**>(nullptr), taps.data(), 2, nullptr);
     kf::IIRInit_BiQuad(static_cast<State**>(nullptr), taps.data(), 1, nullptr);
 
