@@ -3,13 +3,6 @@
 
 #include <kestaccel/DSP.h>
 
-#include <algorithm>
-#include <cstdint>
-#include <limits>
-#include <random>
-#include <type_traits>
-#include <vector>
-
 #include "support/TestSupport.h"
 
 namespace {

@@ -4,12 +4,7 @@
 
 #include <kestaccel/FIR.h>
 
-#include <algorithm>
-#include <cmath>
-#include <cstdint>
 #include <stdexcept>
-#include <string>
-#include <vector>
 
 #include "support/AllocationCount.h"
 #include "support/TestSupport.h"

@@ -5,10 +5,6 @@
 #include <kestaccel/FIR.h>
 #include <kestaccel/Window.h>
 
-#include <cmath>
-#include <string>
-#include <vector>
-
 #include "support/TestSupport.h"
 
 namespace {

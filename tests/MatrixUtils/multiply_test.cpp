@@ -4,15 +4,7 @@
 
 #include <kestaccel/MatrixUtils.h>
 
-#include <algorithm>
-#include <cmath>
-#include <complex>
-#include <cstdint>
-#include <limits>
 #include <new>
-#include <string>
-#include <type_traits>
-#include <vector>
 
 #include "support/TestSupport.h"
 

@@ -6,12 +6,7 @@
 
 #include <kestaccel/MultiRate.h>
 
-#include <cmath>
-#include <cstdint>
-#include <string>
-#include <type_traits>
 #include <utility>
-#include <vector>
 
 #include "support/TestSupport.h"
 

@@ -4,12 +4,6 @@
 
 #include <kestaccel/Window.h>
 
-#include <cmath>
-#include <cstdint>
-#include <limits>
-#include <string>
-#include <vector>
-
 #include "support/TestSupport.h"
 
 namespace {

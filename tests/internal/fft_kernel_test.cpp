@@ -1,12 +1,6 @@
 // Plan tables, and the transform kernels against the reference loop nests
 // of FFTReference.h bit for bit, for every order from 1 to 16.
 
-#include <algorithm>
-#include <cmath>
-#include <cstdint>
-#include <type_traits>
-#include <vector>
-
 #include "FFTReference.h"
 #include "support/TestSupport.h"
 #include "transform/FFT/ComplexKernels.h"
