@@ -13,18 +13,13 @@ namespace ku = kestaccel::utility;
 
 // The constants of each element type, from their bit patterns.
 template <class T>
-struct K;
-template <>
-struct K<float> {
-    static float TwoPi() { return FromBits<float>(0x40C90FDBu); }
-    static float C054() { return FromBits<float>(0x3F0A3D71u); }
-    static float C046() { return FromBits<float>(0x3EEB851Fu); }
-};
-template <>
-struct K<double> {
-    static double TwoPi() { return FromBits<double>(0x401921FB54442D18ull); }
-    static double C054() { return 0.54; }
-    static double C046() { return 0.46; }
+struct K {
+    static T TwoPi()
+    {
+        return sizeof(T) == 4 ? T(FromBits<float>(0x40C90FDBu)) : T(FromBits<double>(0x401921FB54442D18ull));
+    }
+    static T C054() { return sizeof(T) == 4 ? T(FromBits<float>(0x3F0A3D71u)) : T(0.54); }
+    static T C046() { return sizeof(T) == 4 ? T(FromBits<float>(0x3EEB851Fu)) : T(0.46); }
 };
 
 enum Shape { Bartlett, Hann, Hamming, Blackman };
