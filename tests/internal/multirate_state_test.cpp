@@ -82,16 +82,16 @@ std::string GrowthError(Vector& vector, std::size_t size)
 }
 
 // Growing takes the larger of the new size and 1.5 times the capacity, up to
-// the limit; elements are kept and new ones are +0; it never shrinks.
-TEST(MultiRateVectorGrowth, TakesTheLargerOfNewSizeAndOneAndAHalfCapacities)
+// the limit, past which it throws; elements are kept, new ones are +0.
+TEST(MultiRateVectorGrowth, OneAndAHalfCapacitiesUpToTheLimit)
 {
     AllocatorLog log;
     RecordedVector<float> v(RecordingAllocator<float>{&log, 100});
     cpp::PoolVectorGrowTo(v, 10);
     std::fill(v.begin(), v.end(), -1.5f);
     cpp::PoolVectorGrowTo(v, 12);
-    std::vector<float> kept(12, 0.0f);
-    std::fill_n(kept.begin(), 10, -1.5f);
+    std::vector<float> kept(10, -1.5f);
+    kept.resize(12);
     EXPECT_EQ(kept, std::vector<float>(v.begin(), v.end()));
     EXPECT_FALSE(std::signbit(v[11]));
     for (std::size_t size : {30, 20, 80, 81}) cpp::PoolVectorGrowTo(v, size);
@@ -107,10 +107,8 @@ TEST(MultiRateVectorGrowth, TakesTheLargerOfNewSizeAndOneAndAHalfCapacities)
     for (int i = 0; i < 20; ++i) cpp::PoolVectorAppend(w, double(i));
     EXPECT_EQ((std::vector<std::size_t>{1, 2, 3, 4, 6, 9, 13, 19, 28}), appends.allocated);
     for (int i = 0; i < 20; ++i) EXPECT_EQ(double(i), w[std::size_t(i)]);
-}
 
-TEST(MultiRateVectorGrowth, TooLongForTheElementTypeThrowsBeforeAllocating)
-{
+    // A size the element type cannot address throws before allocating.
     cpp::PoolVector<float> samples;
     EXPECT_EQ("vector too long", GrowthError(samples, samples.max_size() + 1));
     EXPECT_EQ("vector too long", GrowthError(samples, std::numeric_limits<std::size_t>::max()));
