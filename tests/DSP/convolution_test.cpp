@@ -31,9 +31,8 @@ class DSP : public ::testing::Test {};
 using ElementTypes = ::testing::Types<float, double>;
 TYPED_TEST_SUITE(DSP, ElementTypes);
 
-// Every pair of counts up to 19 and larger shapes, both overloads; the
-// guarded NaN-filled output pins the length. Widely spread magnitudes make
-// any other order of a sum show, swapped arrays included.
+// Every pair of counts up to 19 and larger shapes, both overloads; widely
+// spread magnitudes make any other order of a sum show.
 TYPED_TEST(DSP, MatchesOneOutputAtATimeBitForBit)
 {
     using T = TypeParam;
@@ -62,9 +61,8 @@ TYPED_TEST(DSP, MatchesOneOutputAtATimeBitForBit)
     }
 }
 
-// (1 + 1e8) - 1e8 is 0 in float, summed in float in ascending order, and 1
-// in double; sums start from +0, so products of -0 give +0; an empty array
-// writes nothing; no work area is needed.
+// (1 + 1e8) - 1e8 is 0 summed in float, 1 in double; sums start from +0, so
+// products of -0 give +0; an empty array writes nothing.
 TYPED_TEST(DSP, WorkedValuesAndEdges)
 {
     using T = TypeParam;
@@ -91,9 +89,8 @@ TYPED_TEST(DSP, WorkedValuesAndEdges)
     EXPECT_EQ(0ull, ku::ConvolutionWorkBufferSize(4294967295u, 4294967295u));
 }
 
-// The source at the phase, zeros elsewhere (only zeros for a phase at or
-// above the factor), -0 kept, the phase unchanged; nothing to write, the
-// phase is not read.
+// The source at the phase, zeros elsewhere (everywhere for a phase at or
+// above the factor), -0 kept; with nothing to write the phase is not read.
 TYPED_TEST(DSP, UpSample)
 {
     using T = TypeParam;
@@ -119,10 +116,8 @@ TYPED_TEST(DSP, UpSample)
     EXPECT_TRUE(dst.Intact());
 }
 
-// One call keeps src[p0], src[p0 + factor], ... and leaves the phase of the
-// next block, also from a phase past the factor and in place, copying bit
-// patterns (a signalling NaN, -0). Below the factor, blocks of random
-// lengths, some shorter than the factor or empty, give the same.
+// One call keeps the bits of src[p0], src[p0 + factor], ..., also in place and
+// from a phase past the factor; blocks of random lengths give the same.
 TYPED_TEST(DSP, DownSampleOneCallAndStreams)
 {
     using T = TypeParam;

@@ -134,7 +134,8 @@ TYPED_TEST(FFT, KnownSpectraOfSizeEight)
     }
     const long double r2 = 2.414213562373095, r0 = 0.41421356237309515;
     const long double re[8] = {4, -1, 0, -1, 0, -1, 0, -1}, im[8] = {0, r2, 0, r0, 0, -r0, 0, -r2};
-    expectSpectrum({0, 0, 0, 0, 1, 1, 1, 1}, [&](unsigned int k) { return std::complex<long double>(re[k], im[k]); }, 2);
+    const auto stepSpectrum = [&](unsigned int k) { return std::complex<long double>(re[k], im[k]); };
+    expectSpectrum({0, 0, 0, 0, 1, 1, 1, 1}, stepSpectrum, 2);
 }
 
 // Compared by value: a zero may come out as -0.
@@ -182,9 +183,8 @@ TYPED_TEST(FFT, RealInverseReadsDcAndNyquistImaginaryParts)
     }
 }
 
-// Every placement gives the bits of the interleaved transform in place:
-// out of place, overlapping, and split arrays distinct, in place, or with
-// the imaginary destination over the real source.
+// Every placement, interleaved or split, overlapping or not, gives the bits
+// of the interleaved transform in place.
 TYPED_TEST(FFT, LayoutsAndPlacementsAgreeBitForBit)
 {
     using E = TypeParam;
@@ -222,10 +222,8 @@ TYPED_TEST(FFT, LayoutsAndPlacementsAgreeBitForBit)
     }
 }
 
-// Only the low five bits of the order count: 32 is one point, copied
-// unscaled (the real one with a zero imaginary part); 33 is order 1, a sum
-// and a difference in that operand order, the real inverse ignoring the
-// imaginary entries.
+// Only the low five bits of the order count: 32 copies one point unscaled;
+// 33 is order 1, a sum and a difference in that operand order.
 TYPED_TEST(FFT, OrdersOneThirtyTwoAndThirtyThree)
 {
     using E = TypeParam;
@@ -254,9 +252,8 @@ TYPED_TEST(FFT, OrdersOneThirtyTwoAndThirtyThree)
     }
 }
 
-// N = 1024 and 4096 on data in [-1, 1): RMS and worst error relative to the
-// oracle's RMS, printed; the bounds sit a few times above what the method
-// reaches (the twiddle drift dominates in double), far below a wrong factor.
+// RMS and worst error relative to the oracle's RMS: bounds a few times above
+// what the method reaches (twiddle drift in double), far below a wrong factor.
 TYPED_TEST(FFT, AccuracyAgainstDirectDFT)
 {
     using E = TypeParam;
@@ -287,7 +284,8 @@ TYPED_TEST(FFT, AccuracyAgainstDirectDFT)
             }
             const long double refRms = std::sqrt(refSquares / bins);
             const double rms = double(std::sqrt(errSquares / bins) / refRms), max = double(worst / refRms);
-            std::printf("%s %s N=%u: rms %.3g, max %.3g\n", real ? "real" : "complex", sizeof(E) == 4 ? "float" : "double", n, rms, max);
+            std::printf("%s %s N=%u: rms %.3g, max %.3g\n", real ? "real" : "complex",
+                        sizeof(E) == 4 ? "float" : "double", n, rms, max);
             EXPECT_LT(rms, rmsBound);
             EXPECT_LT(max, maxBound);
         }
@@ -316,10 +314,8 @@ TYPED_TEST(FFT, TransformsAllocateNothing)
     }
 }
 
-// FFTImpl rounds the length on a log scale (724 -> 512, 725 -> 1024); a
-// nonzero length given to the constructor wins over its order. Its
-// transforms give the bits of a deinterleaved state of its order, also after
-// its state was dropped, rebuilt, or set again unchanged.
+// FFTImpl rounds the length on a log scale, a nonzero one winning over the
+// order; its transforms are a deinterleaved state's, after any rebuild.
 TYPED_TEST(FFT, ImplLengthsAndTransforms)
 {
     using E = TypeParam;

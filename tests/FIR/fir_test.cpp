@@ -57,10 +57,8 @@ struct Filter {
     }
 };
 
-// Tap counts and block lengths that reach the eight-output body, its
-// remainder, and blocks shorter than or straddling the delay line: one call,
-// and the same samples in two (512 as 256 + 256, 1 as 0 + 1), give the bits
-// of one plain pass. The single-sample form gives them too and stores nothing.
+// One call, two calls (512 as 256 + 256) and the single-sample form, which
+// stores nothing, over the eight-output body, its remainder and short blocks.
 TEST(FIR, AllFormsMatchThePlainLoop)
 {
     for (unsigned int taps : {1u, 2u, 3u, 8u, 9u, 17u, 37u, 64u, 256u}) {
@@ -85,9 +83,8 @@ TEST(FIR, AllFormsMatchThePlainLoop)
     }
 }
 
-// Overlapping buffers run in chunks of at most 512 samples, each read whole
-// before it is written: equal pointers match separate buffers (800 samples,
-// 5 taps); a destination above the source feeds outputs back as inputs.
+// Overlapping buffers run in chunks of 512, each read whole before it is
+// written: equal pointers match separate buffers; a higher dst feeds back.
 TEST(FIR, OverlapFollowsTheChunks)
 {
     struct Case {
@@ -117,8 +114,7 @@ TEST(FIR, OverlapFollowsTheChunks)
 }
 
 // Null taps leave zeros until FIRSetTaps, which keeps the delay line; a null
-// delay line clears it. No work buffer exists. Sums start at +0: negative
-// taps on zeros give +0 in the eight-output body and the rest.
+// delay line clears it. Sums start at +0, so -0 products give +0.
 TEST(FIR, SettersNullArgumentsAndSignedZeros)
 {
     const std::uint32_t seed = 43;
@@ -139,9 +135,8 @@ TEST(FIR, SettersNullArgumentsAndSignedZeros)
     EXPECT_TRUE(SameBits(0.0f, kf::FIR(filter.state, 0.0f)));
 }
 
-// Impossible tap counts throw "vector too long", leave the caller's pointer
-// alone and allocate nothing large or lasting. Filtering allocates nothing;
-// Free gives back every block Init took, and ignores null.
+// Impossible tap counts throw before any large or lasting allocation; after
+// Init nothing allocates until Free gives every block back.
 TEST(FIR, AllocationAndImpossibleTapCounts)
 {
     for (unsigned int tapCount : {0u, 0x80000000u, 0x80000001u, 0xFFFFFFFFu}) {
@@ -177,9 +172,8 @@ TEST(FIR, AllocationAndImpossibleTapCounts)
     EXPECT_EQ(CurrentAllocationTally().news, CurrentAllocationTally().deletes);
 }
 
-// A Hamming lowpass at 0.1 passes a low tone and attenuates tones above the
-// cutoff by what its taps' response predicts, measured over whole cycles
-// after the filter settles.
+// A Hamming lowpass at 0.1 passes a low tone and attenuates higher ones by
+// what its taps' response predicts.
 TEST(FIR, LowpassPassesLowToneAndAttenuatesHighTone)
 {
     const unsigned int tapCount = 101;

@@ -1,6 +1,5 @@
-// GenerateLowpassFIRCoefficients against a plain evaluation (sinc with its
-// abscissa advanced by addition, the library's windows in place, scaled by
-// the left half), bit for bit; and the design's frequency response.
+// GenerateLowpassFIRCoefficients against a plain evaluation, bit for bit, and
+// the design's frequency response.
 
 #include <kestaccel/FIR.h>
 #include <kestaccel/Window.h>
@@ -47,10 +46,8 @@ std::vector<double> Design(double cutoff, unsigned int n, int type, bool normali
     return taps.values();
 }
 
-// Both parities; no taps, one (a cosine window of one sample is 0/0) and
-// two; the Nyquist cutoff; a negative cutoff, whose left half keeps its sign
-// through the absolute value in the scale (sums to -1); cutoff 0, whose
-// scale of 1 / 0 makes every tap NaN. Windows 1, 4 and 7 are no window.
+// Both parities, 0 to 2 taps, the Nyquist cutoff, a negative cutoff (its scale
+// takes |left half|: sums to -1), cutoff 0 (NaN taps); 1, 4, 7 are no window.
 TEST(LowpassDesign, MatchesPlainEvaluationAndSumsToOne)
 {
     const struct {

@@ -72,9 +72,8 @@ class IIRFilter : public ::testing::Test {};
 using Precisions = ::testing::Types<float, double>;
 TYPED_TEST_SUITE(IIRFilter, Precisions);
 
-// 0.6 from rest through an order-10 section, and through two biquads whose
-// second is scaled by the first one's a0 (0.111), not its own (0.08):
-// 0.6 * 0.0031 / 0.111 * 0.074 / 0.111.
+// 0.6 from rest through order 10, and through two biquads scaled by the first
+// a0 (0.111), not the second's (0.08): 0.6 * 0.0031 / 0.111 * 0.074 / 0.111.
 TYPED_TEST(IIRFilter, KnownFirstOutputs)
 {
     using T = TypeParam;
@@ -134,9 +133,8 @@ TYPED_TEST(IIRFilter, AllFormsMatchThePlainRecursion)
     }
 }
 
-// Null arguments change nothing (init leaves the caller's pointer alone);
-// SetDlyLine copies every state and null clears only the first section's;
-// SetTaps stores what it is given (an a0 of 2 is not read).
+// Null arguments change nothing; SetDlyLine(null) clears only the first
+// section; SetTaps stores what it is given (an a0 of 2 is not read).
 TYPED_TEST(IIRFilter, SettersAndNullCases)
 {
     using T = TypeParam;
@@ -199,9 +197,8 @@ TYPED_TEST(IIRFilter, FilteringAllocatesNothingAndFreeReleasesAll)
     }
 }
 
-// A 1 kHz lowpass at 48 kHz (Q = 1/sqrt 2, bilinear transform, a0 left for
-// init to divide out), alone and as two sections, attenuates an 8 kHz tone
-// by what its response predicts: two poles, about 12 dB per octave.
+// A 1 kHz biquad lowpass at 48 kHz, alone and doubled, attenuates an 8 kHz
+// tone by what its response predicts (two poles: about 12 dB per octave).
 TYPED_TEST(IIRFilter, BiquadLowpassAttenuatesAToneAboveTheCutoff)
 {
     using T = TypeParam;

@@ -1,6 +1,5 @@
-// Multiply against a naive triple loop. Eigen may round differently
-// (blocking, fused multiply-adds), so products agree within 32 epsilons;
-// layout, aliasing and edge cases are exact.
+// Multiply against a naive triple loop within 32 epsilons, as Eigen may block
+// or fuse; layout, aliasing and edge cases are exact.
 
 #include <kestaccel/MatrixUtils.h>
 

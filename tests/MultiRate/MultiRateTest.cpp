@@ -1,8 +1,5 @@
-// The multi-rate filter: hand-worked values, and every path of the polyphase
-// kernel (eight cycles side by side, four outputs, single outputs, outputs
-// reaching into history) against a model from the definition: U - 1 zeros
-// after every input sample, one FIR filter, every D-th output kept. Then 48
-// kHz to 44.1 kHz on a tone.
+// The multi-rate filter: hand-worked values, every kernel path against a
+// zero-stuffing model bit for bit, and 48 kHz to 44.1 kHz on a tone.
 
 #include <kestaccel/MultiRate.h>
 
@@ -42,9 +39,8 @@ std::vector<T> ProcessOnce(MultiRateFilter<T>& filter, unsigned int up, const T*
     return out.values();
 }
 
-// Outputs at high-rate positions first, first + down, ... of x, zeros before
-// x[0], with the first (tapCount / up) * up taps; each sum from the oldest
-// sample, zeros included, which never change a sum begun at +0.
+// U - 1 zeros after each sample, one FIR with the first (T / U) * U taps from
+// the oldest sample, every D-th output from `first`; zeros never change a sum.
 template <class T>
 std::vector<T> ZeroStuffedOutputs(const std::vector<T>& x, const std::vector<T>& taps, unsigned int up,
                                   unsigned int down, std::int64_t first, std::size_t count)
@@ -94,9 +90,8 @@ class MultiRate : public ::testing::Test {};
 using ElementTypes = ::testing::Types<float, double>;
 TYPED_TEST_SUITE(MultiRate, ElementTypes);
 
-// Two calls with an empty one between. inputIndex is rebased by cycleCount,
-// not by the samples consumed, so the second call starts cycles * (D - 1)
-// samples further on than a seamless stream. The reserved vector is never read.
+// Two calls with an empty one between; the second starts cycles * (D - 1)
+// samples on, inputIndex being rebased by cycleCount, not by samples consumed.
 TYPED_TEST(MultiRate, CallsMatchZeroStuffingModel)
 {
     using T = TypeParam;

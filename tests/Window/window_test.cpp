@@ -1,6 +1,5 @@
-// The cosine-type windows against their closed formulas with the stated
-// constants in the stated order, and the Kaiser window against the rational
-// I0 approximation, bit for bit; that approximation against std::cyl_bessel_i.
+// The cosine windows against their closed formulas and Kaiser against the
+// rational I0 approximation, bit for bit; that approximation against std::cyl_bessel_i.
 
 #include <kestaccel/Window.h>
 
@@ -153,9 +152,8 @@ template <class T>
 class KaiserWindow : public ::testing::Test {};
 TYPED_TEST_SUITE(KaiserWindow, ElementTypes);
 
-// Out of place and in place, where an odd centre (a factor near 1, not
-// always 1 in double) is multiplied once. alpha = 0, and n = 1, copy the
-// source (-0 and NaN too); n = 0 writes nothing; the window of ones is symmetric.
+// In place an odd centre is multiplied once (its factor is not always 1);
+// alpha = 0 and n = 1 copy the source, -0 and NaN too; ones stay symmetric.
 TYPED_TEST(KaiserWindow, MatchesPlainEvaluationBitForBit)
 {
     using T = TypeParam;

@@ -1,9 +1,7 @@
 #pragma once
 
-// The plain loop nests the kernels must reproduce bit for bit: swap-table
-// permutation, two multiplication-free stages, radix-2 stages with the twiddle
-// loop outside; the real transform's own split and combine. Only the plan's
-// tables are shared with the library. Sizes start at 2.
+// The plain loop nests the kernels must reproduce bit for bit, sharing only
+// the plan's tables with the library. Sizes start at 2.
 
 #include <cstddef>
 #include <cstdint>

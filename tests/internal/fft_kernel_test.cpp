@@ -37,9 +37,8 @@ std::vector<E> RecurrenceTable(double theta, double wr, double wi, unsigned int 
     return table;
 }
 
-// Swap entry i is the larger of i and its bit reversal (sizes 8 and 16 by
-// hand); complex twiddles are size/2 pairs from 1, the real combine factors
-// size/2 - 1 pairs from one step past 1.
+// Swap entry i is max(i, bit reversal of i) (sizes 8 and 16 by hand); the
+// twiddles of both plan kinds follow the recurrence bit for bit.
 TYPED_TEST(FFTKernelTyped, PlanTablesEveryOrder)
 {
     using E = TypeParam;
@@ -66,7 +65,8 @@ TYPED_TEST(FFTKernelTyped, PlanTablesEveryOrder)
         if (order == 1) continue;  // two real samples need no tables
         FFTPlan<E> real{};
         ASSERT_TRUE(BuildFFTPlan(real, 0, size));
-        const auto combine = RecurrenceTable<E>(twoPi / size, std::cos(twoPi / size), -std::sin(twoPi / size), size / 2 - 1);
+        const double theta = twoPi / size;
+        const auto combine = RecurrenceTable<E>(theta, std::cos(theta), -std::sin(theta), size / 2 - 1);
         EXPECT_TRUE(SameBitsArray(combine.data(), real.twiddles, size - 2));
         DestroyFFTPlan(real);
     }

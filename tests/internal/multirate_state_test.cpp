@@ -29,9 +29,8 @@ struct Record {
     ~Record() { cpp::MRFFree(state); }
 };
 
-// Branches hold their taps from the highest index down, without the T % U
-// past the last whole group; history holds (T + 1 + U) / U samples, the
-// newest first.
+// Branches hold taps from the highest index down, without the T % U past the
+// last whole group; history holds (T + 1 + U) / U samples, newest first.
 TEST(MultiRateState, BranchLayoutAndHistory)
 {
     Record twoThree(2, 3, 5);
