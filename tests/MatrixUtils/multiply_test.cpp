@@ -1,20 +1,9 @@
-// Multiply against a naive triple loop written here. Eigen's product may
-// round differently (blocking, and fused multiply-adds where its packager
-// enabled them), so results are compared within 32 machine epsilons,
-// absolutely or relative to the larger magnitude, never bit for bit; the
-// layout, aliasing and edge cases are exact.
+// Multiply against a naive triple loop within 32 epsilons, as Eigen may block
+// or fuse; layout, aliasing and edge cases are exact.
 
 #include <kestaccel/MatrixUtils.h>
 
-#include <algorithm>
-#include <cmath>
-#include <complex>
-#include <cstdint>
-#include <limits>
 #include <new>
-#include <string>
-#include <type_traits>
-#include <vector>
 
 #include "support/TestSupport.h"
 
@@ -31,8 +20,7 @@ std::vector<T> Random(std::size_t count, std::uint32_t seed)
     else return RandomComplex<typename T::value_type>(count, seed);
 }
 
-// The column-major product is the row-major product of the swapped
-// operands with the outer dimensions exchanged.
+// Column-major is the row-major product of the swapped operands, transposed.
 template <class T>
 std::vector<T> Naive(MatrixDataOrder order, int rows, int cols, int inner, const std::vector<T>& a,
                      const std::vector<T>& b)
@@ -71,8 +59,7 @@ class MultiplyTyped : public ::testing::Test {};
 using ElementTypes = ::testing::Types<float, double, std::complex<float>, std::complex<double>>;
 TYPED_TEST_SUITE(MultiplyTyped, ElementTypes);
 
-// Both orders. For square shapes c may also be a, b or both: the product is
-// complete before c is written.
+// Both orders; for square shapes c may also be a, b or both.
 TYPED_TEST(MultiplyTyped, AgreesWithNaiveSumWithin32Epsilons)
 {
     using T = TypeParam;
@@ -90,8 +77,7 @@ TYPED_TEST(MultiplyTyped, AgreesWithNaiveSumWithin32Epsilons)
             const auto expected = Naive(order, s.rows, s.cols, s.inner, a, b);
             GuardedBuffer<T> c(expected.size());
             Multiply(order, s.rows, s.cols, s.inner, a.data(), b.data(), c.data());
-            EXPECT_TRUE(AllClose(expected, c.data()));
-            EXPECT_TRUE(c.Intact());
+            EXPECT_TRUE(AllClose(expected, c.data()) && c.Intact());
             if (s.rows != s.cols || s.cols != s.inner) continue;
             const int n = s.rows;
             auto left = a, right = b, both = a;
@@ -106,9 +92,7 @@ TYPED_TEST(MultiplyTyped, AgreesWithNaiveSumWithin32Epsilons)
 }
 
 // An order other than 0 and 1 leaves c untouched; rows or cols of 0 write
-// nothing; inner of 0 fills c with zeros. The worked example, and the same
-// buffers read column-major: a is 2 x 3 with columns (1,2), (3,4), (5,6), b
-// is 3 x 2 with columns (1,0,0), (1,1,1).
+// nothing; inner of 0 gives zeros. One worked example read both ways.
 TYPED_TEST(MultiplyTyped, ExactCases)
 {
     using T = TypeParam;
@@ -125,30 +109,25 @@ TYPED_TEST(MultiplyTyped, ExactCases)
         EXPECT_TRUE(none.Intact());
         GuardedBuffer<T> c(12, T(std::numeric_limits<double>::quiet_NaN()));
         Multiply(order, 3, 4, 0, static_cast<const T*>(nullptr), static_cast<const T*>(nullptr), c.data());
-        EXPECT_TRUE(SameBitsArray(std::vector<T>(12, T(0)), c.values()));
-        EXPECT_TRUE(c.Intact());
+        EXPECT_TRUE(SameBitsArray(std::vector<T>(12, T(0)), c.values()) && c.Intact());
     }
     const T x[] = {T(1), T(2), T(3), T(4), T(5), T(6)}, y[] = {T(1), T(0), T(0), T(1), T(1), T(1)};
     GuardedBuffer<T> c(4);
     Multiply(RowMajor, 2, 2, 3, x, y, c.data());
-    EXPECT_TRUE(SameBitsArray(std::vector<T>{T(4), T(5), T(10), T(11)}, c.values()));
-    EXPECT_TRUE(c.Intact());
+    EXPECT_TRUE(SameBitsArray({T(4), T(5), T(10), T(11)}, c.values()) && c.Intact());
     Multiply(ColMajor, 2, 2, 3, x, y, c.data());
-    EXPECT_TRUE(SameBitsArray(std::vector<T>{T(1), T(2), T(9), T(12)}, c.values()));
+    EXPECT_TRUE(SameBitsArray({T(1), T(2), T(9), T(12)}, c.values()));
 }
 
-// A temporary of 2^60 complex doubles is more bytes than a size_t can
-// count, so it cannot be had: the call throws before c is touched and
-// before either operand is read past its first element. (The size is
-// refused before any allocation is attempted, so no memory is reserved.)
+// 2^60 complex doubles cannot be counted in a size_t: bad_alloc before c is
+// touched, and before any memory is reserved.
 TEST(Multiply, FailedTemporaryThrowsBadAllocAndLeavesOutput)
 {
     using C = std::complex<double>;
     const C a[1] = {C(1, 0)}, b[1] = {C(2, 0)};
     GuardedBuffer<C> c(1, C(7, -7));
     EXPECT_THROW(Multiply(RowMajor, 1 << 30, 1 << 30, 1, a, b, c.data()), std::bad_alloc);
-    EXPECT_TRUE(SameBits(C(7, -7), c[0]));
-    EXPECT_TRUE(c.Intact());
+    EXPECT_TRUE(SameBits(C(7, -7), c[0]) && c.Intact());
 }
 
 }  // namespace

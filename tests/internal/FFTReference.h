@@ -1,11 +1,7 @@
 #pragma once
 
-// Reference transforms written as the plain loop nests the library's
-// kernels must reproduce bit for bit: permutation by the swap table, two
-// multiplication-free stages, then radix-2 stages with the twiddle loop
-// outside and the strided butterfly loop inside; the real transform through
-// its own copy of the split and combine steps. They share only the plan
-// (tables) with the library. Sizes start at 2.
+// The plain loop nests the kernels must reproduce bit for bit, sharing only
+// the plan's tables with the library. Sizes start at 2.
 
 #include <cstddef>
 #include <cstdint>

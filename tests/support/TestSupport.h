@@ -211,6 +211,19 @@ std::vector<std::complex<T>> RandomComplex(std::size_t count, std::uint32_t seed
 
 inline std::string SeedTrace(std::uint32_t seed) { return "seed " + std::to_string(seed); }
 
+constexpr double kPi = 3.14159265358979323846;
+
+// |sum of v[n] exp(-2 pi i f n)| over n < count, in double: the gain of a
+// filter from its taps, or the amplitude of a tone of frequency f (cycles
+// per sample) in a measured span, times count / 2.
+template <class T>
+double DtftMagnitude(const T* v, std::size_t count, double f)
+{
+    std::complex<double> acc = 0.0;
+    for (std::size_t n = 0; n < count; ++n) acc += double(v[n]) * std::polar(1.0, -2.0 * kPi * f * double(n));
+    return std::abs(acc);
+}
+
 // Sizes that reach the vector body, the scalar tail and odd remainders.
 inline const std::vector<unsigned int>& InterestingSizes()
 {
