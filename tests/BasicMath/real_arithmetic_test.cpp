@@ -35,8 +35,9 @@ std::vector<T> Operands(std::size_t n, std::uint32_t seed, bool second)
     const T inf = std::numeric_limits<T>::infinity(), tiny = std::numeric_limits<T>::denorm_min();
     const T first[] = {T(0), -T(0), inf, -inf, QuietNaN<T>(0x21), -QuietNaN<T>(0x5), tiny, T(1)};
     const T other[] = {-T(0), T(0), inf, T(1), tiny, -inf, QuietNaN<T>(0x7), -QuietNaN<T>(0x9)};
+    const T* specials = second ? other : first;
     auto v = RandomReals<T>(n, seed, T(-3), T(3));
-    for (std::size_t i = 0; i < n; i += 5) v[i] = (second ? other : first)[(i / 5) % 8];
+    for (std::size_t i = 0; i < n; i += 5) v[i] = specials[(i / 5) % 8];
     return v;
 }
 
