@@ -56,9 +56,9 @@ struct FactorChunk {
         }
     }
 
-    // The factors at twice the stride, for a stage of q butterfly positions
-    // whose following stage's 2q factors b and c hold (b the first q, c the
-    // next q, each in one chunk): every other one of those.
+    // The q factors of stage s from the 2q of stage s + 1, held whole in b
+    // (the first q) and c (the next q): stage s reads the table at twice the
+    // stride, so its factors are every other one of those.
     void EveryOtherOf(const FactorChunk& b, const FactorChunk& c, std::size_t q)
     {
         const std::size_t half = q / 2;
@@ -199,6 +199,7 @@ void StagePair(const FFTPlan<E>& plan, std::uint32_t s, E* re, E* im, E* outRe, 
         const std::size_t o0 = P::Offset(j0), o1 = P::Offset(j0 + q), o2 = P::Offset(j0 + 2 * q),
                           o3 = P::Offset(j0 + 3 * q);
         if constexpr (kOut == Output::kPairsInPlace) {
+            // Only the last pair writes pairs, and it spans one block.
             E partsRe[4][kChunk], partsIm[4][kChunk];
             StagePairRun<E, F, Output::kSplitArrays, kScale>(
                 1, 4 * q, count, re + o0, im + o0, re + o1, im + o1, re + o2, im + o2, re + o3, im + o3, a.re, a.im,
