@@ -69,7 +69,6 @@ std::vector<std::complex<T>> AwkwardComplex(std::size_t count, std::uint32_t see
 
 template <class T>
 class ComplexArithmetic : public ::testing::Test {};
-using FloatingTypes = ::testing::Types<float, double>;
 TYPED_TEST_SUITE(ComplexArithmetic, FloatingTypes);
 
 // Bits must agree, but a NaN of the hardware's arithmetic may carry either

@@ -83,7 +83,6 @@ std::vector<T> WithSpecials(std::vector<T> values)
 
 template <class T>
 class Elementwise : public ::testing::Test {};
-using FloatingTypes = ::testing::Types<float, double>;
 TYPED_TEST_SUITE(Elementwise, FloatingTypes);
 
 constexpr unsigned int kRuntimeSamples = 16000;

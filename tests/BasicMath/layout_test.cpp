@@ -16,8 +16,7 @@ namespace ku = kestaccel::utility;
 
 template <class T>
 class LayoutTest : public ::testing::Test {};
-using LayoutTypes = ::testing::Types<float, double>;
-TYPED_TEST_SUITE(LayoutTest, LayoutTypes);
+TYPED_TEST_SUITE(LayoutTest, FloatingTypes);
 
 // Random values with a few patterns that a value-changing move would lose.
 template <class T>

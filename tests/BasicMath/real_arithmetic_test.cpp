@@ -24,7 +24,6 @@ static_assert(HasAdd<double>::value && !HasAdd<short>::value && !HasAdd<int>::va
 
 template <class T>
 class RealArithmetic : public ::testing::Test {};
-using FloatingTypes = ::testing::Types<float, double>;
 TYPED_TEST_SUITE(RealArithmetic, FloatingTypes);
 
 // Every fifth element special; the NaNs of a and b never meet, since either

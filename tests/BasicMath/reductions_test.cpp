@@ -48,7 +48,6 @@ std::vector<T> WideReals(std::size_t count, std::uint32_t seed)
 
 template <class T>
 class Reductions : public ::testing::Test {};
-using FloatingTypes = ::testing::Types<float, double>;
 TYPED_TEST_SUITE(Reductions, FloatingTypes);
 
 TYPED_TEST(Reductions, ZerosAndEmptyVectorsGivePositiveZeroAndNormL1ClearsANaNSign)

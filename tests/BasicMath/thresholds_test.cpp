@@ -43,7 +43,6 @@ void EachMember(T level, T value, Check check)
 
 template <class T>
 class Thresholds : public ::testing::Test {};
-using FloatingTypes = ::testing::Types<float, double>;
 TYPED_TEST_SUITE(Thresholds, FloatingTypes);
 
 // By hand: +0 against -0 and a NaN level leave every element's own bits.

@@ -28,8 +28,7 @@ std::vector<T> PlainConvolve(const std::vector<T>& a, const std::vector<T>& b)
 
 template <class T>
 class DSP : public ::testing::Test {};
-using ElementTypes = ::testing::Types<float, double>;
-TYPED_TEST_SUITE(DSP, ElementTypes);
+TYPED_TEST_SUITE(DSP, FloatingTypes);
 
 // Every pair of counts up to 19 and larger shapes, both overloads; widely
 // spread magnitudes make any other order of a sum show.

@@ -106,8 +106,7 @@ protected:
         return out.values();
     }
 };
-using Elements = ::testing::Types<float, double>;
-TYPED_TEST_SUITE(FFT, Elements);
+TYPED_TEST_SUITE(FFT, FloatingTypes);
 
 // Impulses within 1 eps (the real spectrum exactly real at DC and Nyquist)
 // and a step within 2 eps, complex and real.

@@ -69,8 +69,7 @@ std::vector<T> DelayLine(const StateOf<T>* state, std::size_t count)
 
 template <class T>
 class IIRFilter : public ::testing::Test {};
-using Precisions = ::testing::Types<float, double>;
-TYPED_TEST_SUITE(IIRFilter, Precisions);
+TYPED_TEST_SUITE(IIRFilter, FloatingTypes);
 
 // 0.6 from rest through order 10, and through two biquads scaled by the first
 // a0 (0.111), not the second's (0.08): 0.6 * 0.0031 / 0.111 * 0.074 / 0.111.

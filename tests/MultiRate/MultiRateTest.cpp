@@ -87,8 +87,7 @@ const RateCase kCases[] = {
 
 template <class T>
 class MultiRate : public ::testing::Test {};
-using ElementTypes = ::testing::Types<float, double>;
-TYPED_TEST_SUITE(MultiRate, ElementTypes);
+TYPED_TEST_SUITE(MultiRate, FloatingTypes);
 
 // Two calls with an empty one between; the second starts cycles * (D - 1)
 // samples on, inputIndex being rebased by cycleCount, not by samples consumed.

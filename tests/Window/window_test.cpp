@@ -80,8 +80,7 @@ std::vector<T> Expected(Shape s, unsigned int n, const std::vector<T>& src, T al
 
 template <class T>
 class CosineWindow : public ::testing::Test {};
-using ElementTypes = ::testing::Types<float, double>;
-TYPED_TEST_SUITE(CosineWindow, ElementTypes);
+TYPED_TEST_SUITE(CosineWindow, FloatingTypes);
 
 // Out of place and in place; n = 0 writes nothing, n = 1 is 0/0, NaN; the
 // window of ones at another alpha is exactly symmetric.
@@ -150,7 +149,7 @@ std::vector<T> Expected(unsigned int n, std::vector<T> data, T alpha)
 
 template <class T>
 class KaiserWindow : public ::testing::Test {};
-TYPED_TEST_SUITE(KaiserWindow, ElementTypes);
+TYPED_TEST_SUITE(KaiserWindow, FloatingTypes);
 
 // In place an odd centre is multiplied once (its factor is not always 1);
 // alpha = 0 and n = 1 copy the source, -0 and NaN too; ones stay symmetric.

@@ -11,14 +11,14 @@
 namespace {
 
 using namespace kestaccel::transform::cpp;
+using kestaccel_test::FloatingTypes;
 using kestaccel_test::RandomReals;
 using kestaccel_test::SameBitsArray;
 using kestaccel_test::SeedTrace;
 
 template <class E>
 class FFTKernelTyped : public ::testing::Test {};
-using Elements = ::testing::Types<float, double>;
-TYPED_TEST_SUITE(FFTKernelTyped, Elements);
+TYPED_TEST_SUITE(FFTKernelTyped, FloatingTypes);
 
 // The rotation recurrence in double, each product and sum rounded on its
 // own, rounded to E only when stored.

@@ -19,6 +19,9 @@
 
 namespace kestaccel_test {
 
+// The element types of the typed suites that cover both precisions.
+using FloatingTypes = ::testing::Types<float, double>;
+
 // The unsigned integer type of the same width as T.
 template <class T>
 using BitsType = std::conditional_t<sizeof(T) == 4, std::uint32_t, std::uint64_t>;
