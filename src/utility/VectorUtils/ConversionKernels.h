@@ -118,14 +118,17 @@ inline float LimitAndScale(float x, float m)
 // half), from the one conversion and without the rounding mode. Doubling
 // is exact, so +-2m gives the integers of +-m, as the general path does.
 // |v| <= by must convert without a range test, hence by <= 2^30.
-template <bool kRound, int kIndefinite>
+// kSignedLimit false gives +by to the sources beyond -1 as well, for
+// destinations that cannot tell +m from -m (SignOfLimitIsLost): one AND
+// and one OR fewer per vector.
+template <bool kRound, int kIndefinite, bool kSignedLimit = true>
 inline int LimitAndScaleToInt32(float x, float by)
 {
     const float magnitude = std::fabs(x);
     const std::uint32_t inside = 0u - static_cast<std::uint32_t>(magnitude < 1.0f);
     const std::uint32_t beyond = 0u - static_cast<std::uint32_t>(magnitude >= 1.0f);
     const float scaled = x * by;
-    const float limit = std::copysign(by, x);
+    const float limit = kSignedLimit ? std::copysign(by, x) : by;
     std::uint32_t scaledBits, limitBits;
     std::memcpy(&scaledBits, &scaled, sizeof scaledBits);
     std::memcpy(&limitBits, &limit, sizeof limitBits);
@@ -138,6 +141,15 @@ inline int LimitAndScaleToInt32(float x, float by)
 }
 
 constexpr float kShortPathLimit = 1073741824.0f;  // 2^30
+
+// A store that keeps the low 8 or 16 bits turns +m and -m into the same
+// bits once m, a power of two, is at least 2^7 or 2^15: from scale -7 or
+// -15 on, which includes full-scale 16-bit PCM.
+template <class Dst>
+inline bool SignOfLimitIsLost(float m)
+{
+    return sizeof(Dst) <= sizeof(short) && m >= static_cast<float>(1u << (8 * sizeof(Dst) - 1));
+}
 
 template <class Dst>
 constexpr int kIndefiniteAfterStore = sizeof(Dst) <= sizeof(short) ? 0 : INT_MIN;
@@ -211,7 +223,10 @@ template <bool kRound, class Dst>
 void FloatToIntegerScaled(unsigned int count, const float* src, Dst* dst, float m)
 {
     const float by = kRound ? m + m : m;
-    if (by <= kShortPathLimit) {
+    if (by <= kShortPathLimit && SignOfLimitIsLost<Dst>(m)) {
+        StoreEach(count, src, dst,
+                  [by](float x) { return LimitAndScaleToInt32<kRound, kIndefiniteAfterStore<Dst>, false>(x, by); });
+    } else if (by <= kShortPathLimit) {
         StoreEach(count, src, dst,
                   [by](float x) { return LimitAndScaleToInt32<kRound, kIndefiniteAfterStore<Dst>>(x, by); });
     } else {
