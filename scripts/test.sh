@@ -2,8 +2,8 @@
 # Installs what is missing, builds everything and runs the whole test suite:
 #   1. the release build (tests, export check, installed-consumer check);
 #   2. the same suite under AddressSanitizer and UndefinedBehaviorSanitizer;
-#   3. the bit-exact tests of a build for x86-64-v3, which must give the same
-#      bits as the baseline build;
+#   3. the bit-exact tests of builds for x86-64-v3 and x86-64-v4 (AVX-512),
+#      which must give the same bits as the baseline build;
 #   4. the whole suite cross-built for 64-bit Windows and run under Wine.
 # Set KESTACCEL_QUICK=1 to run only the first; KESTACCEL_SKIP_WINDOWS=1 skips
 # the fourth.
@@ -35,11 +35,13 @@ ASAN_OPTIONS=detect_leaks=1:halt_on_error=1 UBSAN_OPTIONS=halt_on_error=1:print_
     LSAN_OPTIONS="suppressions=$PWD/scripts/lsan-suppressions.txt:print_suppressions=0" \
     ctest --test-dir build-sanitize --output-on-failure --timeout 900 -j "$jobs" -L bitexact
 
-step "x86-64-v3 build: the same bits as the baseline"
-cmake -S . -B build-v3 -DCMAKE_BUILD_TYPE=Release -DKESTACCEL_ISA=x86-64-v3 "-DCMAKE_CXX_FLAGS=-O3" \
-    -DKESTACCEL_BUILD_BENCHMARKS=OFF -DKESTACCEL_BUILD_EXAMPLES=OFF -DKESTACCEL_INSTALL=OFF
-cmake --build build-v3 -j "$jobs"
-ctest --test-dir build-v3 --output-on-failure --timeout 600 -j "$jobs" -L bitexact
+for isa in x86-64-v3 x86-64-v4; do
+    step "$isa build: the same bits as the baseline"
+    cmake -S . -B "build-$isa" -DCMAKE_BUILD_TYPE=Release -DKESTACCEL_ISA=$isa "-DCMAKE_CXX_FLAGS=-O3" \
+        -DKESTACCEL_BUILD_BENCHMARKS=OFF -DKESTACCEL_BUILD_EXAMPLES=OFF -DKESTACCEL_INSTALL=OFF
+    cmake --build "build-$isa" -j "$jobs"
+    ctest --test-dir "build-$isa" --output-on-failure --timeout 600 -j "$jobs" -L 'bitexact|isa'
+done
 
 if [ "${KESTACCEL_SKIP_WINDOWS:-0}" != 1 ]; then
     step "Windows build (MinGW-w64), tests under Wine"

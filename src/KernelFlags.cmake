@@ -40,3 +40,23 @@ kestaccel_kernel_flags(filter/MultiRate/MultiRate.cpp -O2)
 # here, so -fno-trapping-math changes no bit; the complex tests compare the
 # divide members with the plain steps of the method, element by element.
 kestaccel_kernel_flags(utility/BasicMath/ComplexArithmetic.cpp -fno-trapping-math)
+
+# Matrix product: Eigen refuses AVX-512 without FMA, and the library builds
+# with -mno-fma. The product is the one operation whose bits are not fixed
+# across builds (Eigen's summation order follows the vector width; its
+# results agree within a tolerance), so on an AVX-512 build this one file
+# may fuse. The later -mfma overrides the target's -mno-fma for it alone.
+#
+# With AVX-512, g++ 12 turns a pair of lanes that add and subtract products,
+# the (re, im) of a complex product, into vfmaddsub/vfmsubadd even under
+# -ffp-contract=off and -mno-fma: the AVX-512 forms of those instructions do
+# not depend on the FMA flag. The complex products' loops stay at 256-bit
+# AVX2, where -mno-fma holds; the real FFT's combine loops only meet it in
+# the straight-line vectoriser, which that file does without. A package
+# test scans the library for fused instructions outside the matrix product.
+if(KESTACCEL_ISA MATCHES "v4|avx512")
+    # Eigen's AVX-512 headers trip g++ 12's -Wmaybe-uninitialized.
+    kestaccel_kernel_flags(utility/MatrixUtils/Multiply.cpp -mfma -Wno-maybe-uninitialized)
+    kestaccel_kernel_flags(utility/BasicMath/ComplexArithmetic.cpp -fno-trapping-math -mno-avx512f)
+    kestaccel_kernel_flags(transform/FFT/FFT.cpp -fno-tree-slp-vectorize)
+endif()
