@@ -30,7 +30,7 @@ std::vector<double> Expected(double cutoff, unsigned int n, int type, bool norma
     if (!normalize) return taps;
     double left = 0.0;
     for (unsigned int i = 0; i < h; ++i) left = left + taps[i];
-    const double g = 1.0 / (std::fabs(left) * 2.0 + (odd ? taps[h] : 0.0));
+    const double g = 1.0 / std::fabs(left * 2.0 + (odd ? taps[h] : 0.0));
     for (auto& t : taps) t = t * g;
     return taps;
 }
@@ -46,8 +46,9 @@ std::vector<double> Design(double cutoff, unsigned int n, int type, bool normali
     return taps.values();
 }
 
-// Both parities, 0 to 2 taps, the Nyquist cutoff, a negative cutoff (its scale
-// takes |left half|: sums to -1), cutoff 0 (NaN taps); 1, 4, 7 are no window.
+// Both parities, 0 to 2 taps, the Nyquist cutoff, a negative cutoff (the scale
+// divides by the size of the whole sum: sums to -1), cutoff 0 (NaN taps); 1, 4,
+// 7 are no window. A NaN the arithmetic makes is promised as a NaN only.
 TEST(LowpassDesign, MatchesPlainEvaluationAndSumsToOne)
 {
     const struct {
@@ -61,7 +62,10 @@ TEST(LowpassDesign, MatchesPlainEvaluationAndSumsToOne)
                 SCOPED_TRACE("cutoff=" + std::to_string(dc.cutoff) + " taps=" + std::to_string(dc.taps) +
                              " window=" + std::to_string(type) + " normalize=" + std::to_string(normalize));
                 const auto taps = Design(dc.cutoff, dc.taps, type, normalize);
-                EXPECT_TRUE(SameBitsArray(Expected(dc.cutoff, dc.taps, type, normalize), taps));
+                auto expected = Expected(dc.cutoff, dc.taps, type, normalize);
+                for (std::size_t i = 0; i < taps.size(); ++i)
+                    if (std::isnan(expected[i]) && std::isnan(taps[i])) expected[i] = taps[i];
+                EXPECT_TRUE(SameBitsArray(expected, taps));
                 if (!normalize || dc.taps < 3 || dc.cutoff == 0.0) continue;
                 double sum = 0.0;
                 for (double t : taps) sum += t;

@@ -52,14 +52,15 @@ inline void ApplyDesignWindow(utility::DSPWindowType windowType, unsigned int ta
 }
 
 // Only the left half is summed and counted twice; the windows are exactly
-// symmetric, so the right half would add the same. The absolute value keeps
-// the sign of a negative sum, which then scales to -1. One division in all.
+// symmetric, so the right half would add the same. The gain divides by the
+// size of the whole sum, so a negative sum keeps its sign and scales to -1.
+// One division in all.
 inline void NormaliseToUnitSum(unsigned int tapCount, double* taps)
 {
     const unsigned int h = tapCount >> 1;
     const double centre = (tapCount & 1u) ? taps[h] : 0.0;
     const double leftHalf = utility::cpp::Sum(h, static_cast<const double*>(taps));
-    const double gain = 1.0 / (std::fabs(leftHalf) * 2.0 + centre);
+    const double gain = 1.0 / std::fabs(leftHalf * 2.0 + centre);
     for (unsigned int i = 0; i < tapCount; ++i) taps[i] = taps[i] * gain;
 }
 
