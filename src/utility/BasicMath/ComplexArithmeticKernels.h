@@ -38,41 +38,47 @@ void Product(T xr, T xi, T yr, T yi, T& re, T& im)
     im = xr * yi + xi * yr;
 }
 
+// Element i is read whole, both components of both operands, before it is
+// written, so a destination that starts half an element after a source sees
+// what the loop over whole elements sees.
+template <class T, class Op>
+void EachElement(unsigned int count, const std::complex<T>* a, const std::complex<T>* b, std::complex<T>* dst, Op op)
+{
+    const T* x = Components(a);
+    const T* y = Components(b);
+    T* out = Components(dst);
+    for (std::size_t i = 0; i < count; ++i) {
+        const T xr = x[2 * i], xi = x[2 * i + 1], yr = y[2 * i], yi = y[2 * i + 1];
+        out[2 * i] = op(xr, yr);
+        out[2 * i + 1] = op(xi, yi);
+    }
+}
+
 }  // namespace detail
 
 template <class T>
 void Add(unsigned int count, const std::complex<T>* a, const std::complex<T>* b, std::complex<T>* dst)
 {
-    const T* x = detail::Components(a);
-    const T* y = detail::Components(b);
-    T* out = detail::Components(dst);
-    for (std::size_t i = 0; i < 2 * std::size_t(count); ++i) out[i] = x[i] + y[i];
+    detail::EachElement(count, a, b, dst, [](T x, T y) { return x + y; });
 }
 
 template <class T>
 void Add_InPlace(unsigned int count, const std::complex<T>* src, std::complex<T>* srcDst)
 {
-    const T* x = detail::Components(src);
-    T* io = detail::Components(srcDst);
-    for (std::size_t i = 0; i < 2 * std::size_t(count); ++i) io[i] = x[i] + io[i];
+    Add(count, src, srcDst, srcDst);
 }
 
 // The first vector is the subtrahend, as in the real family.
 template <class T>
 void Sub(unsigned int count, const std::complex<T>* a, const std::complex<T>* b, std::complex<T>* dst)
 {
-    const T* x = detail::Components(a);
-    const T* y = detail::Components(b);
-    T* out = detail::Components(dst);
-    for (std::size_t i = 0; i < 2 * std::size_t(count); ++i) out[i] = y[i] - x[i];
+    detail::EachElement(count, a, b, dst, [](T x, T y) { return y - x; });
 }
 
 template <class T>
 void Sub_InPlace(unsigned int count, const std::complex<T>* src, std::complex<T>* srcDst)
 {
-    const T* x = detail::Components(src);
-    T* io = detail::Components(srcDst);
-    for (std::size_t i = 0; i < 2 * std::size_t(count); ++i) io[i] = io[i] - x[i];
+    Sub(count, src, srcDst, srcDst);
 }
 
 template <class T>

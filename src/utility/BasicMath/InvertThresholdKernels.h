@@ -28,8 +28,12 @@ void Invert_Threshold_InPlace(unsigned int count, T* srcDst, T threshold)
         }
         return;
     }
+    // -1 / threshold is a division of its own: read through a volatile, the
+    // -1 cannot be folded into -(1 / threshold), which differs for a NaN
+    // threshold (the division passes the NaN's sign on, the negation flips it).
+    const volatile T minusOne = T(-1);
     const T top = T(1) / threshold;
-    const T negativeTop = T(-1) / threshold;
+    const T negativeTop = minusOne / threshold;
     for (std::size_t i = 0; i < count; ++i) {
         const T x = srcDst[i];
         const T s = std::fabs(x);
