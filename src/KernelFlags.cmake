@@ -24,7 +24,13 @@ kestaccel_kernel_flags(filter/FIR/FIR.cpp -O2)
 # shorts to floats) and bound by their loads and stores, so the counter and
 # branch of each iteration cost a few percent; unrolled, 4% less time for
 # float to short at 4096 elements.
-kestaccel_kernel_flags(utility/VectorUtils/Conversion.cpp -fno-trapping-math -funroll-loops)
+# -fno-strict-aliasing: a conversion between overlapping buffers of different
+# element types (an int read where a float was just written) must give the
+# ascending loop's result; under the type-based rules g++ may assume a short
+# and a float never share memory and reorder the loads and stores. Without
+# them the vectorised loops are versioned on a run-time overlap test, as the
+# loops between buffers of one type already are.
+kestaccel_kernel_flags(utility/VectorUtils/Conversion.cpp -fno-trapping-math -funroll-loops -fno-strict-aliasing)
 
 # Multi-rate filter: the same shape as the FIR kernel (eight cycles side by
 # side, one sum each), and the same story: -O2 makes each tap two vector
