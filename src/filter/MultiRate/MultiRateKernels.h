@@ -3,6 +3,7 @@
 #include <cstdint>
 #include <cstring>
 
+#include "common/DivideFault.h"
 #include "filter/MultiRate/MultiRateState.h"
 #include "filter/MultiRate/PolyphaseKernels.h"
 #include "filter/MultiRate/PoolVectorGrowth.h"
@@ -32,6 +33,10 @@ void MRFInit(State** state, unsigned int upFactor, unsigned int downFactor, cons
     *state = filter;
     filter->upFactor = upFactor;
     filter->downFactor = downFactor;
+    if (upFactor == 0) {
+        detail::RaiseIntegerDivideFault();  // the first division by U below
+        return;
+    }
 
     // Branch p takes taps p, p + U, ... up to the last whole group of U taps,
     // stored from the highest index down. The T % U taps past the last whole

@@ -214,6 +214,37 @@ std::int64_t HistoryRun(const MultiRateRecord<T>& filter, std::int64_t length, c
     return run;
 }
 
+// One output at a time, each stored before the next is computed: the plain
+// loop, for a destination that overlaps samples still to be read, and for
+// empty branches, whose outputs read nothing at all.
+template <class T>
+void OutputsOneByOne(const MultiRateRecord<T>& filter, const T* src, T* dst, std::int64_t count, Position& position)
+{
+    const Step step = MakeStep(filter.upFactor, filter.downFactor);
+    const std::int64_t length = std::int64_t(filter.phaseFilters[0].size());
+    const T* history = filter.history.data();
+    for (std::int64_t n = 0; n < count; ++n) {
+        dst[n] = OutputReachingHistory(filter.phaseFilters[position.phase].data(), length, position.inputIndex, src,
+                                       history);
+        Advance(position, step);
+    }
+}
+
+// Whether the `count` outputs from `position` would be written over source
+// samples that a later output still reads. Compared as integers: the arrays
+// may be unrelated objects.
+template <class T>
+bool OutputsOverlapSource(const MultiRateRecord<T>& filter, const T* src, const T* dst, std::int64_t count,
+                          const Position& position)
+{
+    const std::int64_t lastNewest =
+        position.inputIndex +
+        std::int64_t((std::uint64_t(position.phase) + std::uint64_t(count - 1) * filter.downFactor) / filter.upFactor);
+    if (lastNewest < 0) return false;
+    const auto s = reinterpret_cast<std::uintptr_t>(src), d = reinterpret_cast<std::uintptr_t>(dst);
+    return d < s + std::uintptr_t(lastNewest + 1) * sizeof(T) && s < d + std::uintptr_t(count) * sizeof(T);
+}
+
 // Writes `count` outputs from `position` on, and leaves `position` after them.
 // Whole groups of kLanes cycles go side by side where that pays; the other
 // outputs go four at a time, or one at a time, those whose window reaches
@@ -228,6 +259,10 @@ void ComputeOutputs(const MultiRateRecord<T>& filter, const T* src, T* dst, std:
     const auto& branches = filter.phaseFilters;
     const std::size_t length = branches[0].size();
     const std::int64_t lengthSigned = std::int64_t(length);
+    if (length == 0 || OutputsOverlapSource(filter, src, dst, count, position)) {
+        OutputsOneByOne(filter, src, dst, count, position);
+        return;
+    }
 
     // A tile costs (L + D) * kLanes copies against U * L * kLanes products.
     // At D of 1 it is needed only while windows reach into history, and pays
