@@ -18,9 +18,19 @@ namespace kestaccel {
 namespace transform {
 namespace cpp {
 
+template <class State>
+void FreeState(State* state)
+{
+    if (state == nullptr) return;
+    DestroyFFTPlan(state->plan);
+    delete state;
+}
+
 // The argument is an order, not a length. A null pointer or order 0 leaves
 // the caller's variable as it was; orders act through their low five bits.
 // The plan builder's result is dropped: sizes 1 and 2 simply have no tables.
+// An allocation that fails part way releases what was built before the
+// exception goes on to the caller, whose variable is only written at the end.
 template <class State>
 void InitState(State** state, unsigned int order, unsigned int kind)
 {
@@ -28,16 +38,13 @@ void InitState(State** state, unsigned int order, unsigned int kind)
     State* created = new State{};
     created->order = order;
     created->size = 1u << (order & 31u);
-    BuildFFTPlan(created->plan, kind, created->size);
+    try {
+        BuildFFTPlan(created->plan, kind, created->size);
+    } catch (...) {
+        FreeState(created);
+        throw;
+    }
     *state = created;
-}
-
-template <class State>
-void FreeState(State* state)
-{
-    if (state == nullptr) return;
-    DestroyFFTPlan(state->plan);
-    delete state;
 }
 
 inline void FFTInit(FFTState_Float** state, unsigned int order) { InitState(state, order, kRealPlan); }
@@ -78,6 +85,15 @@ bool Overlap(const E* a, const E* b, std::size_t count)
     return x < y + bytes && y < x + bytes;
 }
 
+// The staging moves and the real transforms' final copy form their byte
+// count in 32 bits, as Move and Copy do. From 4 GiB of data on, the count
+// wraps and they move too little or nothing: the paths that skip the staging
+// for distinct buffers then give way to the literal steps, which keep that.
+template <class E>
+bool InterleavedMoveWraps(unsigned int size) { return utility::cpp::ByteCountWraps<E>(2 * size); }
+template <class E>
+bool DeinterleavedMoveWraps(unsigned int size) { return utility::cpp::ByteCountWraps<E>(size); }
+
 // Interleaved complex: the result is that of moving the data into the
 // destination (src == dst is fine) and transforming it there, so the state
 // is only read and two threads may share it. Distinct arrays take the
@@ -89,7 +105,7 @@ void ComplexInterleaved(const std::complex<E>* src, std::complex<E>* dst, const 
     const E* from = reinterpret_cast<const E*>(src);
     E* to = reinterpret_cast<E*>(dst);
     const unsigned int count = 2 * state->size;
-    if (!Overlap(from, to, count)) {
+    if (!Overlap(from, to, count) && !InterleavedMoveWraps<E>(state->size)) {
         if (inverse) {
             PairsInto<E, true>(plan, from, to);
         } else {
@@ -118,7 +134,7 @@ void ComplexDeinterleaved(const E* srcReal, const E* srcImag, E* dstReal, E* dst
     const unsigned int n = plan.size;
     const bool distinct = !Overlap(srcReal, dstReal, n) && !Overlap(srcReal, dstImag, n) &&
                           !Overlap(srcImag, dstReal, n) && !Overlap(srcImag, dstImag, n);
-    if (!distinct) {
+    if (!distinct || DeinterleavedMoveWraps<E>(n)) {
         utility::cpp::Move(n, srcReal, dstReal);
         utility::cpp::Move(n, srcImag, dstImag);
         srcReal = dstReal;

@@ -59,6 +59,15 @@ template <class E>
     }
 }
 
+// The spectrum leaves the scratch through Copy, whose byte count is formed in
+// 32 bits. From N * sizeof(E) = 4 GiB on, that count is a multiple of 4 GiB
+// plus the two elements of bin 0, and only those reach dst.
+template <class E>
+bool RealCopyWraps(unsigned int size)
+{
+    return utility::cpp::ByteCountWraps<E>(size + 2);
+}
+
 template <class E>
 void RealFFTForward(FFTPlan<E>& plan, const E* src, E* dst)
 {
@@ -87,6 +96,12 @@ void RealFFTForward(FFTPlan<E>& plan, const E* src, E* dst)
     E* zi = zr + h + (h >= 16 ? 16 : 0);
     const FFTPlan<E>& half = *plan.halfPlan;
     PairsToSplitForward(half, src, zr, zi);
+    if (RealCopyWraps<E>(plan.size)) {
+        // Bin 0 alone: the rest of the spectrum would not be copied out.
+        dst[0] = zr[0] + zi[0];
+        dst[1] = E(0) + E(0);
+        return;
+    }
 
     const E* w = plan.twiddles;
     CombineLower(h, zr, zi, w, dst);

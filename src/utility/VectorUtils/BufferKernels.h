@@ -33,6 +33,14 @@ unsigned int ByteCount32(unsigned int count)
     return count * static_cast<unsigned int>(sizeof(T));
 }
 
+// Whether ByteCount32 has wrapped, so that a block operation moves less than
+// `count` elements (at 4 GiB exactly, nothing).
+template <class T>
+bool ByteCountWraps(unsigned int count)
+{
+    return static_cast<unsigned long long>(count) * sizeof(T) != ByteCount32<T>(count);
+}
+
 template <class T>
 void Copy(unsigned int count, const T* src, T* dst)
 {
