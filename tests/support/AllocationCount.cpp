@@ -12,9 +12,15 @@ std::atomic<std::size_t> g_news{0};
 std::atomic<std::size_t> g_deletes{0};
 std::atomic<std::size_t> g_largest{0};
 
+std::atomic<std::size_t> g_failAt{0};
+
 void* CountedAllocate(std::size_t size)
 {
-    g_news.fetch_add(1);
+    if (g_news.fetch_add(1) + 1 == g_failAt.load()) {
+        g_news.fetch_sub(1);
+        g_failAt.store(0);
+        throw std::bad_alloc();
+    }
     std::size_t seen = g_largest.load();
     while (size > seen && !g_largest.compare_exchange_weak(seen, size)) {
     }
@@ -63,6 +69,11 @@ void ResetAllocationTally()
     g_news.store(0);
     g_deletes.store(0);
     g_largest.store(0);
+}
+
+void FailAllocationNumber(std::size_t k)
+{
+    g_failAt.store(k == 0 ? 0 : g_news.load() + k);
 }
 
 bool LibraryAllocationsAreCounted()

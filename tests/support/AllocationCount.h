@@ -26,6 +26,10 @@ struct AllocationTally {
 AllocationTally CurrentAllocationTally();
 void ResetAllocationTally();
 
+// Makes the k-th allocation from now on throw std::bad_alloc, counted
+// neither as a new nor as the largest; 0 disarms.
+void FailAllocationNumber(std::size_t k);
+
 // True when an allocation made inside the library reaches the tally.
 bool LibraryAllocationsAreCounted();
 

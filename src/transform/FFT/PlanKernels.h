@@ -7,7 +7,6 @@
 #include <cmath>
 #include <cstdint>
 #include <cstring>
-#include <new>
 
 #include "transform/FFT/FFTPlan.h"
 
@@ -112,7 +111,9 @@ bool BuildFFTPlan(FFTPlan<E>& plan, unsigned int kind, unsigned int size)
         return true;
     }
     if (size < 2) return true;
-    plan.halfPlan = new (std::nothrow) FFTPlan<E>{};
+    // The general allocator throws on failure; the null test stays all the
+    // same, as in every allocation of a plan record.
+    plan.halfPlan = new FFTPlan<E>{};
     if (plan.halfPlan == nullptr) return false;
     if (!BuildFFTPlan(*plan.halfPlan, kComplexPlan, size >> 1)) return false;
     plan.twiddles = new E[size - 2];
