@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstddef>
+#include <type_traits>
 
 #include "kestcore/allocator/MemoryRecycler.h"
 
