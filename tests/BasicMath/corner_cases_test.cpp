@@ -15,12 +15,12 @@ using namespace kestaccel_test;
 namespace ku = kestaccel::utility;
 
 template <class T>
-class ComplexHalfElementOverlap : public ::testing::Test {};
-TYPED_TEST_SUITE(ComplexHalfElementOverlap, FloatingTypes);
+class BasicMathCorners : public ::testing::Test {};
+TYPED_TEST_SUITE(BasicMathCorners, FloatingTypes);
 
 // One element at a time, read whole before it is written, over the very
 // same memory the library gets.
-TYPED_TEST(ComplexHalfElementOverlap, SumsAndDifferencesActElementByElement)
+TYPED_TEST(BasicMathCorners, ComplexSumsReadEachElementWhole)
 {
     using T = TypeParam;
     using C = std::complex<T>;
@@ -67,7 +67,7 @@ TYPED_TEST(ComplexHalfElementOverlap, SumsAndDifferencesActElementByElement)
 
 // -1 / threshold is a division: a NaN threshold's sign and payload pass on
 // to the elements it sends to -1 / threshold.
-TYPED_TEST(ComplexHalfElementOverlap, NegativeLimitOfANaNThresholdIsADivision)
+TYPED_TEST(BasicMathCorners, NegativeLimitOfANaNThresholdIsADivision)
 {
     using T = TypeParam;
     for (T threshold : {QuietNaN<T>(0x5), -QuietNaN<T>(0x9)}) {
