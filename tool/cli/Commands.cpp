@@ -87,7 +87,7 @@ double ParseNumber(const std::string& text, const std::string& what, double lo, 
     }
     if (v < lo || v > hi) {
         char buf[160];
-        std::snprintf(buf, sizeof buf, " must lie between %g and %g, not %s", lo, hi, text.c_str());
+        std::snprintf(buf, sizeof buf, " must lie between %.10g and %.10g, not %s", lo, hi, text.c_str());
         throw UsageError(what + buf);
     }
     return v;
