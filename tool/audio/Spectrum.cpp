@@ -111,14 +111,21 @@ ToneFigures MeasureTone(const double* x, std::size_t n, double rate, double freq
     // accurate to a beta of about 15, not enough for 200 dB.
     const double beta = 28;
     const double pi = 3.14159265358979323846;
-    std::vector<double> w(n), buf(n + 2);
-    double w2 = 0;
-    for (std::size_t i = 0; i < n; ++i) {
-        const double r = (2.0 * i) / double(n - 1) - 1;
-        w[i] = std::cyl_bessel_i(0.0, beta * std::sqrt(std::max(0.0, 1 - r * r))) / std::cyl_bessel_i(0.0, beta);
-        buf[i] = x[i] * w[i];
-        w2 += w[i] * w[i];
+    // The window of the last length asked for is kept: measurements come in
+    // long runs of one length.
+    static std::vector<double> w;
+    static double w2 = 0;
+    if (w.size() != n) {
+        w.resize(n);
+        w2 = 0;
+        for (std::size_t i = 0; i < n; ++i) {
+            const double r = (2.0 * i) / double(n - 1) - 1;
+            w[i] = std::cyl_bessel_i(0.0, beta * std::sqrt(std::max(0.0, 1 - r * r))) / std::cyl_bessel_i(0.0, beta);
+            w2 += w[i] * w[i];
+        }
     }
+    std::vector<double> buf(n + 2);
+    for (std::size_t i = 0; i < n; ++i) buf[i] = x[i] * w[i];
     kestaccel::FFTState_Double* state = nullptr;
     kt::FFTInit(&state, OrderOf(n));
     kt::FFTFwd(buf.data(), buf.data(), state, nullptr);

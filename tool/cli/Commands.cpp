@@ -304,8 +304,8 @@ const char* const kResampleHelp =
     "is done by the library's polyphase filter with a Kaiser-windowed lowpass that the preset\n"
     "designs for the two rates:\n"
     "  fast     flat to 80 % of the lower Nyquist frequency,  80 dB stopband, float\n"
-    "  default  flat to 90 %, 110 dB stopband, float (the default)\n"
-    "  best     flat to 95 %, 140 dB stopband, double\n"
+    "  default  flat to 85 %, 100 dB stopband, float (the default)\n"
+    "  best     flat to 95 %, 175 dB stopband (Kaiser design target), double\n"
     "The output is exactly what one filter call over the whole file gives, in bounded memory.\n"
     "--stats prints the filter's ratio, taps, passband ripple, stopband attenuation and speed.\n"
     "Prints the SHA-256 of the output samples.\n";
