@@ -9,8 +9,8 @@ namespace kestaudio {
 
 namespace {
 
-const int kWidth = 900, kHeight = 460;
-const int kLeft = 80, kRight = 190, kTop = 40, kBottom = 60;
+const int kWidth = 960, kHeight = 460;
+const int kLeft = 80, kRight = 250, kTop = 40, kBottom = 60;
 const char* const kColours[] = {"#1f77b4", "#d62728", "#2ca02c", "#ff7f0e", "#9467bd",
                                 "#8c564b", "#e377c2", "#17becf", "#7f7f7f", "#bcbd22"};
 

@@ -58,8 +58,10 @@ int CreateTemporary(const std::string& path, std::string& temporary)
 
 void Finalise(int fd, const std::string& temporary, const std::string& path)
 {
-    if (fsync(fd) != 0 || close(fd) != 0) {
-        throw Failure("writing '" + path + "' failed: " + std::strerror(errno));
+    const bool synced = fsync(fd) == 0;
+    const int syncError = errno;
+    if (close(fd) != 0 || !synced) {
+        throw Failure("writing '" + path + "' failed: " + std::strerror(synced ? errno : syncError));
     }
     if (rename(temporary.c_str(), path.c_str()) != 0) {
         throw Failure("cannot create '" + path + "': " + std::strerror(errno));
@@ -216,6 +218,7 @@ void OutputFile::Write(const float* interleaved, std::size_t frames)
         for (int b = 0; b < width; ++b) bytes.push_back((unsigned char)(v >> (8 * b)));
     };
     sf_count_t written;
+    errno = 0;
     if (kind == SampleKind::Float) {
         for (std::size_t i = 0; i < n; ++i) {
             std::uint32_t v;

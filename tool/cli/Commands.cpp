@@ -105,9 +105,12 @@ unsigned long ParseWhole(const std::string& text, const std::string& what, unsig
 class Progress {
 public:
     Progress(bool quiet, std::uint64_t total_) : total(total_), enabled(!quiet && isatty(2) && total_ > 0) {}
-    ~Progress()
+    ~Progress() { Done(); }
+    // Clears the bar before anything else is printed.
+    void Done()
     {
         if (drawn) std::fputs("\r\033[K", stderr);
+        drawn = false;
     }
     void Update(std::uint64_t done)
     {
@@ -193,6 +196,7 @@ RunResult RunPipeline(InputFile& input, const std::string& outPath, const Output
         if (got == 0) break;
     }
     const std::string digest = output.Commit();
+    progress.Done();
     std::printf("samples-sha256 %s  %s\n", digest.c_str(), outPath.c_str());
     return result;
 }
@@ -579,6 +583,7 @@ int Generate(const std::vector<std::string>& argv)
         progress.Update(end);
     }
     const std::string digest = output.Commit();
+    progress.Done();
     std::printf("samples-sha256 %s  %s\n", digest.c_str(), args.positional[0].c_str());
     return 0;
 }

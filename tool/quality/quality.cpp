@@ -19,6 +19,9 @@
 #include <string>
 #include <vector>
 
+#include <stdlib.h>
+#include <unistd.h>
+
 #include <kestaccel/FFT.h>
 
 #include "audio/Resampler.h"
@@ -398,6 +401,12 @@ int main(int argc, char** argv)
     md << "- FFTW: " << fftw_version << " (`FFTW_ESTIMATE` plans)\n";
 #endif
     for (const std::string& a : about) md << "- " << a << "\n";
+    // The machine is shared: its load says how far to trust the timings.
+    double load[3] = {0, 0, 0};
+    getloadavg(load, 3);
+    md << "- Load average when the run started: " << Fmt("%.1f", load[0]) << " (1 min), " << Fmt("%.1f", load[1])
+       << " (5 min) on " << sysconf(_SC_NPROCESSORS_ONLN) << " cores: the machine is shared, so speeds are\n"
+       << "  best compared within one table, as ratios, rather than as absolute figures.\n";
 
     md << "\n## Resampling\n\n"
        << "Each resampler converts sines of amplitude 0.5 (mono) and is measured on 16384 output samples from the\n"
@@ -494,7 +503,12 @@ int main(int argc, char** argv)
        << "Forward complex transforms of uniform random data in [-1, 1) against a radix-2 transform in long double\n"
        << "whose every twiddle factor is its own `sinl`/`cosl`: the RMS error over the RMS of the reference\n"
        << "spectrum, and the largest error over the largest reference magnitude, the worst of "
-       << (quick ? 2 : 4) << " inputs. kissfft runs as Debian's float library and as its C++ template in double.\n\n";
+       << (quick ? 2 : 4) << " inputs. kissfft runs as Debian's float library and as its C++ template in double.\n\n"
+       << "In float the three agree. In double the library's error grows with the size, to about 2e-12 at 65536\n"
+       << "points against 3e-16 for FFTW: its twiddle factors are defined as the values of a rotation recurrence\n"
+       << "in double, part of what makes its results the same bits everywhere, and the recurrence's rounding\n"
+       << "accumulates along the table. The float transform rounds the same values to float, far below its own\n"
+       << "rounding, so its error matches the peers'.\n\n";
     Plot fftPlot;
     fftPlot.title = "FFT: RMS error relative to a long-double reference";
     fftPlot.xLabel = "size (points)";
