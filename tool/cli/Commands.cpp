@@ -328,7 +328,8 @@ const char* const kConvertHelp =
     "                         [--quiet]\n"
     "Rewrites the samples in another container or sample format. The container comes from\n"
     "--format, else OUT's extension, else the input's; integer samples are rounded and limited\n"
-    "to full scale. Prints the SHA-256 of the output samples.\n";
+    "to full scale. Samples pass through float: 32-bit integers keep 24 significant bits.\n"
+    "Prints the SHA-256 of the output samples.\n";
 
 const char* const kSpectrumHelp =
     "usage: kestaccel spectrum IN OUT.svg [--quiet]\n"
