@@ -3,7 +3,9 @@
 # that are missing, and any further packages named as arguments.
 set -euo pipefail
 
-packages=(cmake g++ make pkg-config python3 binutils libeigen3-dev libgtest-dev libgmock-dev libbenchmark-dev "$@")
+# libsndfile and OpenSSL for the kestaccel tool (tool/), built with the rest.
+packages=(cmake g++ make pkg-config python3 binutils libeigen3-dev libgtest-dev libgmock-dev libbenchmark-dev
+          libsndfile1-dev libssl-dev "$@")
 missing=()
 for p in "${packages[@]}"; do
     dpkg-query -W -f='${Status}' "$p" 2>/dev/null | grep -q 'install ok installed' || missing+=("$p")
