@@ -24,7 +24,7 @@ from ._kestaccel import *  # noqa: F401,F403
 from ._kestaccel import (FFTState_Float, FFTState_Double, FFTState_Complex_Float_Interleaved,
                          FFTState_Complex_Double_Interleaved, FFTState_Complex_Float_Deinterleaved,
                          FFTState_Complex_Double_Deinterleaved)
-
+from .helpers import fft, ifft, rfft, irfft, lfilter, sosfilt  # noqa: F401
 
 _FFT_STATES = (FFTState_Float, FFTState_Double, FFTState_Complex_Float_Interleaved,
                FFTState_Complex_Double_Interleaved, FFTState_Complex_Float_Deinterleaved,
