@@ -3,7 +3,8 @@
 # that are missing, and any further packages named as arguments.
 set -euo pipefail
 
-packages=(cmake g++ make pkg-config python3 binutils libeigen3-dev libgtest-dev libgmock-dev libbenchmark-dev "$@")
+packages=(cmake g++ make pkg-config python3 binutils libeigen3-dev libgtest-dev libgmock-dev libbenchmark-dev
+          pybind11-dev python3-dev python3-numpy python3-scipy python3-pytest "$@")
 missing=()
 for p in "${packages[@]}"; do
     dpkg-query -W -f='${Status}' "$p" 2>/dev/null | grep -q 'install ok installed' || missing+=("$p")

@@ -1,6 +1,7 @@
 #!/usr/bin/env bash
 # Installs what is missing, builds everything and runs the whole test suite:
-#   1. the release build (tests, export check, installed-consumer check);
+#   1. the release build (tests, export check, installed-consumer check, the
+#      Python bindings' tests);
 #   2. the same suite under AddressSanitizer and UndefinedBehaviorSanitizer;
 #   3. the bit-exact tests of builds for x86-64-v3 and x86-64-v4 (AVX-512),
 #      which must give the same bits as the baseline build;
@@ -26,7 +27,7 @@ fi
 
 step "sanitizer build and tests (address, undefined)"
 cmake -S . -B build-sanitize -DCMAKE_BUILD_TYPE=RelWithDebInfo \
-    -DKESTACCEL_BUILD_BENCHMARKS=OFF -DKESTACCEL_BUILD_EXAMPLES=OFF -DKESTACCEL_INSTALL=OFF \
+    -DKESTACCEL_BUILD_BENCHMARKS=OFF -DKESTACCEL_BUILD_EXAMPLES=OFF -DKESTACCEL_INSTALL=OFF -DKESTACCEL_BUILD_PYTHON=OFF \
     "-DCMAKE_CXX_FLAGS=-fsanitize=address,undefined -fno-sanitize-recover=all -fno-omit-frame-pointer" \
     "-DCMAKE_EXE_LINKER_FLAGS=-fsanitize=address,undefined" \
     "-DCMAKE_SHARED_LINKER_FLAGS=-fsanitize=address,undefined"
@@ -38,7 +39,8 @@ ASAN_OPTIONS=detect_leaks=1:halt_on_error=1 UBSAN_OPTIONS=halt_on_error=1:print_
 for isa in x86-64-v3 x86-64-v4; do
     step "$isa build: the same bits as the baseline"
     cmake -S . -B "build-$isa" -DCMAKE_BUILD_TYPE=Release -DKESTACCEL_ISA=$isa "-DCMAKE_CXX_FLAGS=-O3" \
-        -DKESTACCEL_BUILD_BENCHMARKS=OFF -DKESTACCEL_BUILD_EXAMPLES=OFF -DKESTACCEL_INSTALL=OFF
+        -DKESTACCEL_BUILD_BENCHMARKS=OFF -DKESTACCEL_BUILD_EXAMPLES=OFF -DKESTACCEL_INSTALL=OFF \
+        -DKESTACCEL_BUILD_PYTHON=OFF
     cmake --build "build-$isa" -j "$jobs"
     ctest --test-dir "build-$isa" --output-on-failure --timeout 600 -j "$jobs" -L 'bitexact|isa'
 done
