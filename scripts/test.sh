@@ -1,7 +1,6 @@
 #!/usr/bin/env bash
 # Installs what is missing, builds everything and runs the whole test suite:
-#   1. the release build (tests, export check, installed-consumer check, the
-#      Python bindings' tests);
+#   1. the release build (tests, export check, installed-consumer check);
 #   2. the same suite under AddressSanitizer and UndefinedBehaviorSanitizer;
 #   3. the bit-exact tests of builds for x86-64-v3 and x86-64-v4 (AVX-512),
 #      which must give the same bits as the baseline build;
@@ -27,8 +26,9 @@ fi
 
 step "sanitizer build and tests (address, undefined)"
 cmake -S . -B build-sanitize -DCMAKE_BUILD_TYPE=RelWithDebInfo \
-    -DKESTACCEL_BUILD_BENCHMARKS=OFF -DKESTACCEL_BUILD_EXAMPLES=OFF -DKESTACCEL_INSTALL=OFF -DKESTACCEL_BUILD_PYTHON=OFF \
+    -DKESTACCEL_BUILD_BENCHMARKS=OFF -DKESTACCEL_BUILD_EXAMPLES=OFF -DKESTACCEL_INSTALL=OFF \
     "-DCMAKE_CXX_FLAGS=-fsanitize=address,undefined -fno-sanitize-recover=all -fno-omit-frame-pointer" \
+    -DKESTACCEL_BUILD_PYTHON=OFF \
     "-DCMAKE_EXE_LINKER_FLAGS=-fsanitize=address,undefined" \
     "-DCMAKE_SHARED_LINKER_FLAGS=-fsanitize=address,undefined"
 cmake --build build-sanitize -j "$jobs"
