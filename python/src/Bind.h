@@ -337,8 +337,8 @@ py::class_<O> OwnerClass(py::module_& m, const char* name, const char* doc)
             "Frees the C++ state now, as the C++ Free call does; a closed state raises ValueError when used. "
             "Closing twice is harmless.")
         .def_property_readonly("closed", [](const O& o) { return o.state == nullptr; })
-        .def("__enter__", [](py::object self) { return self; })
-        .def("__exit__", [](O& o, py::args) { o.Close(); });
+        .def("__enter__", [](py::object self) { return self; }, "Returns the state itself.")
+        .def("__exit__", [](O& o, py::args) { o.Close(); }, "Closes the state: its Free call.");
 }
 
 // Registration of each module of the bindings.

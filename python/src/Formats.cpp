@@ -242,7 +242,8 @@ void BindFormats(py::module_& m)
         "int32 -> int24: an arithmetic right shift by the low five bits of scale, then saturation. "
         "int24 -> int32: sign extension, no shift. float32 <-> float64: plain IEEE conversions.\n"
         "24-bit samples are arrays of kestaccel.int24 (numpy.dtype('V3')) or any 3-byte void or structured "
-        "dtype; numpy.frombuffer(raw, kestaccel.int24) views packed little-endian bytes.\nOverloads:" +
+        "dtype: a packed uint8 array of 3n bytes is bytes.view(kestaccel.int24), and .view(numpy.uint8) gives "
+        "the bytes back.\nOverloads:" +
         Overloads();
     m.def("Convert", &Convert, convert.c_str(), py::arg("src"), py::arg("dst"), py::arg("scale") = py::none(),
           py::arg("round") = py::none());

@@ -79,7 +79,7 @@ void BindFFT(py::module_& m)
          : K::layout == Interleaved   ? " Interleaved complex transforms only read the state."
                                       : " Deinterleaved transforms write the state's scratch.");
     OwnerClass<St>(m, K::name, doc.c_str())
-        .def(py::init<unsigned>(), py::arg("order"))
+        .def(py::init<unsigned>(), "FFTInit: a state of 1 << (order % 32) points.", py::arg("order"))
         .def_readonly("order", &St::order)
         .def_readonly("size", &St::size);
     m.def(
@@ -180,6 +180,11 @@ struct Impl {
         Require(impl != nullptr, "the FFTImpl is closed");
         return *impl;
     }
+    void Close()
+    {
+        Require(!busy, "the FFTImpl is in use by another thread");
+        impl.reset();
+    }
 };
 
 template <class S, class C>
@@ -224,6 +229,7 @@ void BindImpl(py::module_& m, const char* name)
                  self->impl = std::make_unique<kt::FFTImpl<S, C>>(order, fftSize);
                  return self;
              }),
+             "FFTImpl(order, fftSize): a nonzero fftSize wins, rounded to a power of two; FFTImpl() has no state.",
              py::arg("order") = 0, py::arg("fftSize") = 0)
         .def(
             "SetFFTSize",
@@ -236,7 +242,8 @@ void BindImpl(py::module_& m, const char* name)
             "SetFFTSize(fftSize): rebuilds the state for a new length; the same length as before costs one "
             "comparison.",
             py::arg("fftSize"))
-        .def("GetOrder", [](const I& self) { return self.Get().GetOrder(); })
+        .def("GetOrder", [](const I& self) { return self.Get().GetOrder(); },
+             "The order of the transform in use; 0 when there is no state.")
         .def("GetFFTSize", [](const I& self) { return self.Get().GetFFTSize(); }, "The length as asked, unrounded.")
         .def("GetBlockSize", [](const I& self) { return self.Get().GetBlockSize(); },
              "1 << (order % 32), the length transformed.")
@@ -247,15 +254,9 @@ void BindImpl(py::module_& m, const char* name)
         .def("ProcessInv", process(false),
              "ProcessInv(srcReal, srcImag, dstReal=None, dstImag=None) -> (dstReal, dstImag): FFTInv, scaled by 1/N.",
              py::arg("srcReal"), py::arg("srcImag"), py::arg("dstReal") = py::none(), py::arg("dstImag") = py::none())
-        .def(
-            "close",
-            [](I& self) {
-                Require(!self.busy, "the FFTImpl is in use by another thread");
-                self.impl.reset();
-            },
-            "Destroys the C++ object now; later calls raise ValueError.")
-        .def("__enter__", [](py::object self) { return self; })
-        .def("__exit__", [](I& self, py::args) { self.impl.reset(); });
+        .def("close", &I::Close, "Destroys the C++ object now; later calls raise ValueError.")
+        .def("__enter__", [](py::object self) { return self; }, "Returns the object itself.")
+        .def("__exit__", [](I& self, py::args) { self.Close(); }, "Destroys the C++ object.");
 }
 
 }  // namespace
