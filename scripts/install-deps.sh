@@ -7,6 +7,8 @@ set -euo pipefail
 packages=(cmake g++ make pkg-config python3 binutils libeigen3-dev libgtest-dev libgmock-dev libbenchmark-dev
           libsndfile1-dev libssl-dev "$@")
 missing=()
+# The Python bindings (python/) and their tests.
+packages+=(pybind11-dev python3-dev python3-numpy python3-scipy python3-pytest)
 for p in "${packages[@]}"; do
     dpkg-query -W -f='${Status}' "$p" 2>/dev/null | grep -q 'install ok installed' || missing+=("$p")
 done

@@ -29,6 +29,7 @@ step "sanitizer build and tests (address, undefined)"
 cmake -S . -B build-sanitize -DCMAKE_BUILD_TYPE=RelWithDebInfo \
     -DKESTACCEL_BUILD_BENCHMARKS=OFF -DKESTACCEL_BUILD_EXAMPLES=OFF -DKESTACCEL_INSTALL=OFF -DKESTACCEL_BUILD_TOOL=OFF \
     "-DCMAKE_CXX_FLAGS=-fsanitize=address,undefined -fno-sanitize-recover=all -fno-omit-frame-pointer" \
+    -DKESTACCEL_BUILD_PYTHON=OFF \
     "-DCMAKE_EXE_LINKER_FLAGS=-fsanitize=address,undefined" \
     "-DCMAKE_SHARED_LINKER_FLAGS=-fsanitize=address,undefined"
 cmake --build build-sanitize -j "$jobs"
@@ -39,7 +40,8 @@ ASAN_OPTIONS=detect_leaks=1:halt_on_error=1 UBSAN_OPTIONS=halt_on_error=1:print_
 for isa in x86-64-v3 x86-64-v4; do
     step "$isa build: the same bits as the baseline"
     cmake -S . -B "build-$isa" -DCMAKE_BUILD_TYPE=Release -DKESTACCEL_ISA=$isa "-DCMAKE_CXX_FLAGS=-O3" \
-        -DKESTACCEL_BUILD_BENCHMARKS=OFF -DKESTACCEL_BUILD_EXAMPLES=OFF -DKESTACCEL_INSTALL=OFF -DKESTACCEL_BUILD_TOOL=OFF
+        -DKESTACCEL_BUILD_BENCHMARKS=OFF -DKESTACCEL_BUILD_EXAMPLES=OFF -DKESTACCEL_INSTALL=OFF \
+        -DKESTACCEL_BUILD_TOOL=OFF -DKESTACCEL_BUILD_PYTHON=OFF
     cmake --build "build-$isa" -j "$jobs"
     ctest --test-dir "build-$isa" --output-on-failure --timeout 600 -j "$jobs" -L 'bitexact|isa'
 done
