@@ -16,7 +16,6 @@
 #include <kestaccel/kestaccel.h>
 
 #include <algorithm>
-#include <array>
 #include <cctype>
 #include <cstdint>
 #include <cstdio>
@@ -24,6 +23,7 @@
 #include <functional>
 #include <limits>
 #include <random>
+#include <set>
 #include <string>
 #include <tuple>
 #include <type_traits>
@@ -131,27 +131,25 @@ std::vector<T> Values(unsigned seed, std::size_t n, bool specials)
 class Out {
 public:
     explicit Out(bool keepNaN) : keepNaN_(keepNaN) {}
-
     template <class T>
-    void Value(T v)
+    void operator()(const T* p, std::size_t n = 1)
     {
-        if constexpr (IsComplex<T>::value) {
-            Value(v.real());
-            Value(v.imag());
-        } else {
-            if constexpr (std::is_floating_point<T>::value)
-                if (v != v && !keepNaN_) v = Special<T>(~std::size_t(0));
-            const auto* bytes = reinterpret_cast<const unsigned char*>(&v);
-            bytes_.insert(bytes_.end(), bytes, bytes + sizeof v);
+        for (std::size_t i = 0; i < n; ++i) {
+            if constexpr (IsComplex<T>::value) {
+                (*this)(reinterpret_cast<const typename T::value_type*>(p + i), 2);
+            } else {
+                T v = p[i];
+                if constexpr (std::is_floating_point<T>::value)
+                    if (v != v && !keepNaN_) v = Special<T>(~std::size_t(0));
+                const auto* bytes = reinterpret_cast<const unsigned char*>(&v);
+                bytes_.insert(bytes_.end(), bytes, bytes + sizeof v);
+            }
         }
     }
     template <class T>
-    void operator()(const T* p, std::size_t n)
-    {
-        for (std::size_t i = 0; i < n; ++i) Value(p[i]);
-    }
-    template <class T>
     void operator()(const std::vector<T>& v) { (*this)(v.data(), v.size()); }
+    template <class T>
+    void Value(T v) { (*this)(&v); }
     const std::vector<unsigned char>& bytes() const { return bytes_; }
 
 private:
@@ -219,17 +217,14 @@ struct Slot {
 template <class Sig> struct Member;
 template <class R, class... A>
 struct Member<R(unsigned, A...)> {
+    // The element types of the buffers in order, each once, else the result's.
     static std::string Suffix()
     {
-        std::vector<std::string> names;
-        const auto add = [&names](std::string n) {
-            if (std::find(names.begin(), names.end(), n) == names.end()) names.push_back(n);
-        };
-        (((std::is_pointer<A>::value || std::is_reference<A>::value) ? add(TypeName<typename Slot<A>::E>()) : void()), ...);
-        if constexpr (!std::is_void<R>::value)
-            if (names.empty()) add(TypeName<R>());
         std::string s;
-        for (const auto& n : names) s += "." + n;
+        const auto add = [&s](std::string n) { s += (s + ".").find("." + n + ".") == std::string::npos ? "." + n : ""; };
+        ((std::is_pointer<A>::value || std::is_reference<A>::value ? add(TypeName<typename Slot<A>::E>()) : void()), ...);
+        if constexpr (!std::is_void<R>::value)
+            if (s.empty()) add(TypeName<R>());
         return s;
     }
     static std::size_t ScalarsBefore(std::size_t i)
@@ -364,7 +359,7 @@ void RegisterReductions()
         Op<void(unsigned, const float*, float&, float&)>("MinMax" + p, kBits | data, MinMax);
         Op<void(unsigned, const float*, float&, float&, unsigned&, unsigned&)>("MinMaxIndex" + p, kBits | data,
                                                                               MinMaxIndex);
-        Reg("MinMax.peak" + p + ".f32", kBits | data, [](Ctx& x) { x.out.Value(MinMax(x.In<float>(1, kN).data(), kN)); });
+        Op<Red<float>>("MinMax.peak" + p, kBits | data, [](unsigned n, const float* src) { return MinMax(src, n); });
     }
     Op<Bin<float>>("MaxEvery", kBits, MaxEvery), Op<Bin<float>>("MinEvery", kBits, MinEvery);
     Op<InP<float>>("MaxEvery_InPlace", kBits, MaxEvery_InPlace);
@@ -401,17 +396,13 @@ void RegisterBuffersAndFormats()
             Op<Un<T>>("Move", kBits, Move);
     });
     Op<bool(unsigned, const unsigned char*, const unsigned char*)>("Equal", 0, Equal);
-    Reg("Malloc_Complex", 0, [](Ctx& x) {
-        unsigned char* bytes = Malloc_Byte(kN);
-        short* shorts = Malloc_Int16(kN);
-        float* floats = Malloc_Float(kN);
-        double* doubles = Malloc_Double(kN);
+    Reg("Malloc", 0, [](Ctx& x) {
         CF* cf = Malloc_Complex_Float(kN);
         CD* cd = Malloc_Complex_Double(kN);
-        x.out(cf, kN), x.out(cd, kN);
-        // Free accepts a block of any element type.
-        Free(reinterpret_cast<short*>(bytes)), Free(reinterpret_cast<float*>(shorts));
-        Free(reinterpret_cast<double*>(floats)), Free(reinterpret_cast<CF*>(doubles));
+        x.out(cf, kN), x.out(cd, kN);  // the complex blocks alone start at (0, 0)
+        // Free takes a block of any element type.
+        Free(reinterpret_cast<short*>(Malloc_Byte(kN))), Free(reinterpret_cast<float*>(Malloc_Int16(kN)));
+        Free(reinterpret_cast<double*>(Malloc_Float(kN))), Free(reinterpret_cast<CF*>(Malloc_Double(kN)));
         Free(reinterpret_cast<CD*>(cf)), Free(reinterpret_cast<unsigned char*>(cd));
     });
     Reg("ModeControls", 0, [](Ctx& x) {
@@ -434,35 +425,27 @@ void RegisterBuffersAndFormats()
         Op<Rounded<float, int24_t>>("Convert" + r, 0, Convert, {-23, double(round)});
         Op<Rounded<double, int>>("Convert" + r, 0, Convert, {-31, double(round)});
     }
-
     ForTypes<unsigned short, unsigned, int24_t, unsigned long long>([](auto t) {
         using T = decltype(t);
         Op<Self<T>>("SwapBytes_InPlace", 0, SwapBytes), Op<Un<T>>("SwapBytes", 0, SwapBytes);
     });
-    Reg("ConvertFloat2Half", 0, [](Ctx& x) {
-        auto src = x.In<float>(1, kN);
-        std::vector<unsigned short> dst(kN);
-        ConvertFloat2Half(src.data(), dst.data(), kN);
-        x.out(dst);
+    Op<Un<float, unsigned short>>("ConvertFloat2Half", 0, [](unsigned n, const float* src, unsigned short* dst) {
+        ConvertFloat2Half(const_cast<float*>(src), dst, n);
     });
-    Reg("ConvertHalf2Float", 0, [](Ctx& x) {
-        auto src = x.In<unsigned short>(1, kN);
-        std::vector<float> dst(kN);
-        ConvertHalf2Float(src.data(), dst.data(), kN);
-        x.out(dst);
+    Op<Un<unsigned short, float>>("ConvertHalf2Float", 0, [](unsigned n, const unsigned short* src, float* dst) {
+        ConvertHalf2Float(const_cast<unsigned short*>(src), dst, n);
     });
-
     ForTypes<float, double>([](auto t) {
         using T = decltype(t);
         Op<Bin<T>>("Interleave", kBits, Interleave), Op<Split<T>>("Deinterleave", kBits, Deinterleave);
-        Reg("Interleave.channels." + TypeName<T>(), kBits, [](Ctx& x) {
-            const auto a = x.In<T>(1, kN), b = x.In<T>(2, kN), c = x.In<T>(3, kN);
-            const T* sources[] = {a.data(), b.data(), c.data()};
-            std::vector<T> mixed(3 * kN), d(3 * kN);
-            Interleave(3, kN, sources, mixed.data());
-            T* destinations[] = {d.data(), d.data() + kN, d.data() + 2 * kN};
-            Deinterleave(3, kN, x.In<T>(4, 3 * kN).data(), destinations);
-            x.out(mixed), x.out(d);
+        // Three channels of n / 3 frames, from and to one buffer.
+        Op<Un<T>>("Interleave.channels", kBits, [](unsigned n, const T* src, T* dst) {
+            const T* sources[] = {src, src + n / 3, src + 2 * (n / 3)};
+            Interleave(3, n / 3, sources, dst);
+        });
+        Op<Un<T>>("Deinterleave.channels", kBits, [](unsigned n, const T* src, T* dst) {
+            T* destinations[] = {dst, dst + n / 3, dst + 2 * (n / 3)};
+            Deinterleave(3, n / 3, src, destinations);
         });
     });
 }
@@ -471,43 +454,39 @@ void RegisterDSP()
 {
     ForTypes<float, double>([](auto t) {
         using T = decltype(t);
-        Reg("Convolve." + TypeName<T>(), kPlain, [](Ctx& x) {
-            const auto a = x.In<T>(1, 37), b = x.In<T>(2, kN);
-            std::vector<T> five(37 + kN - 1), six(five.size());
-            Convolve(37, a.data(), kN, b.data(), five.data());
-            Convolve(kN, b.data(), 37, a.data(), six.data(), nullptr);
-            x.out(five), x.out(six), x.out.Value(ConvolutionWorkBufferSize(37, kN));
+        // 37 by n elements, both forms, each order of the arrays.
+        Op<Bin<T>>("Convolve", kPlain, [](unsigned n, const T* a, const T* b, T* dst) { Convolve(37, a, n, b, dst); });
+        Op<Bin<T>>("Convolve.work", kPlain, [](unsigned n, const T* a, const T* b, T* dst) {
+            Convolve(n, b, 37, a, dst, nullptr);
         });
-        // Streams through split calls: the phase carries from one to the next.
-        Reg("UpDownSample." + TypeName<T>(), kBits, [](Ctx& x) {
-            const auto src = x.In<T>(1, kN);
-            std::vector<T> up(3 * kN), down(kN);
+        Op<Un<T>>("UpSample", kBits, [](unsigned n, const T* src, T* dst) {
             unsigned phase = 1;
-            UpSample(kN, src.data(), up.data(), 3, &phase);
-            phase = 2;
-            DownSample(100, src.data(), down.data(), 3, &phase);
-            x.out.Value(phase);
-            DownSample(kN - 100, src.data() + 100, down.data() + 33, 3, &phase);
-            x.out.Value(phase), x.out(up), x.out(down);
+            UpSample(n / 3, src, dst, 3, &phase);
+        });
+        // A stream of two blocks: the phase carries over; it ends at dst[n].
+        Op<Un<T>>("DownSample", kBits, [](unsigned n, const T* src, T* dst) {
+            unsigned phase = 2;
+            DownSample(100, src, dst, 3, &phase);
+            DownSample(n - 100, src + 100, dst + 33, 3, &phase);
+            dst[n] = T(phase);
         });
         Op<Un<T>>("WindowBartlett", 0, WindowBartlett), Op<Un<T>>("WindowHann", kRuntime, WindowHann);
         Op<Un<T>>("WindowHamming", kRuntime, WindowHamming);
         Op<SrcDstC<T>>("WindowBlackman", kRuntime, WindowBlackman, {-0.16});
         Op<SrcDstC<T>>("WindowKaiser", 0, WindowKaiser, {0.1});
     });
+    Op<unsigned long long(unsigned)>("ConvolutionWorkBufferSize", 0, [](unsigned n) {
+        return ConvolutionWorkBufferSize(37, n);
+    });
+    // Large enough for Eigen's blocked product (rows + cols + inner > 20).
     ForTypes<float, double, CF, CD>([](auto t) {
         using T = decltype(t);
-        for (const MatrixDataOrder order : {RowMajor, ColMajor}) {
-            const std::string name = order == RowMajor ? "Multiply.RowMajor." : "Multiply.ColMajor.";
-            Reg(name + TypeName<T>(), kMultiply | kPlain, [order](Ctx& x) {
-                for (const auto& d : {std::array<int, 3>{13, 11, 37}, std::array<int, 3>{64, 48, 80}}) {
-                    const auto a = x.In<T>(1, d[0] * d[2]), b = x.In<T>(2, d[2] * d[1]);
-                    std::vector<T> c(d[0] * d[1]);
-                    Multiply(order, d[0], d[1], d[2], a.data(), b.data(), c.data());
-                    x.out(c);
-                }
-            });
-        }
+        Op<Bin<T>>("Multiply.RowMajor", kMultiply | kPlain, [](unsigned, const T* a, const T* b, T* c) {
+            Multiply(RowMajor, 13, 11, 29, a, b, c);
+        });
+        Op<Bin<T>>("Multiply.ColMajor", kMultiply | kPlain, [](unsigned, const T* a, const T* b, T* c) {
+            Multiply(ColMajor, 13, 11, 29, a, b, c);
+        });
     });
     // Bartlett, none (1), Hamming, Hann; odd and even counts, both scalings.
     for (const int w : {0, 1, 2, 3}) {
@@ -677,16 +656,15 @@ int main()
 {
     RegisterArithmetic(), RegisterElementwise(), RegisterReductions(), RegisterThresholds();
     RegisterBuffersAndFormats(), RegisterDSP(), RegisterFilters();
-    std::vector<std::string> seen;  // names differ also without case: Windows folders ignore it
+    std::set<std::string> seen;  // names differ also without case: Windows folders ignore it
     std::FILE* list = std::fopen("cases.txt", "wb");
     for (const Case& c : cases) {
         std::string lower = c.name;
         std::transform(lower.begin(), lower.end(), lower.begin(), [](unsigned char ch) { return std::tolower(ch); });
-        if (std::find(seen.begin(), seen.end(), lower) != seen.end()) {
+        if (!seen.insert(lower).second) {
             std::fprintf(stderr, "two cases named %s\n", c.name.c_str());
             return 1;
         }
-        seen.push_back(lower);
         Ctx x{(c.flags & kPlain) == 0, Out((c.flags & kBits) != 0)};
         c.run(x);
         std::FILE* file = std::fopen(c.name.c_str(), "wb");
