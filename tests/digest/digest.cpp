@@ -66,8 +66,10 @@ T FromBits(Bits bits)
 }
 
 // Specials of a floating type: signed zeros, infinities, subnormals, extremes,
-// halfway cases of Round and of Convert at scales -7, -15, -23 and -31, and
-// NaNs with payloads (quiet of either sign, signalling).
+// halfway cases of Round and of Convert at scales -7, -15, -23 and -31, the
+// two classic traps of rounding by adding one half (the largest value below
+// 0.5, and 2^p + 1 where p is the fraction width), and NaNs with payloads
+// (quiet of either sign, signalling).
 template <class T>
 T Special(std::size_t k)
 {
@@ -79,7 +81,8 @@ T Special(std::size_t k)
     const T values[] = {T(0), -T(0), L::infinity(), -L::infinity(), L::denorm_min(), L::denorm_min() - L::min(),
                         L::min(), L::max(), -L::max(), T(0.5), T(1.5), T(2.5), T(-2.5), T(-0.5), T(1), T(-1),
                         T(3e19), T(1) / T(256), T(3) / T(65536), T(-5) / T(65536), T(3) / T(16777216),
-                        T(-1) / T(4294967296.0)};
+                        T(-1) / T(4294967296.0), T(0.5) - L::epsilon() / 4, T(1) / L::epsilon() + 1,
+                        -(T(1) / L::epsilon() + 1)};
     constexpr std::size_t kValues = sizeof values / sizeof values[0];
     if (k == ~std::size_t(0)) return FromBits<T>(exponent | quiet);  // the canonical NaN
     if (k % (kValues + 3) < kValues) return values[k % (kValues + 3)];
