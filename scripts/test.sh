@@ -5,16 +5,42 @@
 #   2. the same suite under AddressSanitizer and UndefinedBehaviorSanitizer;
 #   3. the bit-exact tests of builds for x86-64-v3 and x86-64-v4 (AVX-512),
 #      which must give the same bits as the baseline build;
-#   4. the whole suite cross-built for 64-bit Windows and run under Wine.
+#   4. the bit-exact tests built by g++ at -O0, and by clang at the baseline
+#      and for x86-64-v4;
+#   5. the whole suite cross-built for 64-bit Windows and run under Wine;
+#   6. the bit-exact tests cross-built for Linux on AArch64, run under qemu.
+# Every build checks the digests of tests/digest/digests.txt (the digest
+# test; KESTACCEL_DIGEST_WRITE=1 records them instead, see docs/same-bits.md).
 # Set KESTACCEL_QUICK=1 to run only the first; KESTACCEL_SKIP_WINDOWS=1 skips
-# the fourth.
+# the fifth, KESTACCEL_SKIP_AARCH64=1 the sixth. The time of each stage is
+# printed at the end.
 set -euo pipefail
 cd "$(dirname "$0")/.."
 
 jobs=$(nproc)
 scripts/install-deps.sh
 
-step() { printf '\n== %s\n' "$*"; }
+stage=""
+started=$SECONDS
+times=()
+step() {
+    [ -z "$stage" ] || times+=("$(printf '%6d s  %s' $((SECONDS - started)) "$stage")")
+    stage="$*"
+    started=$SECONDS
+    [ -z "$stage" ] || printf '\n== %s\n' "$*"
+}
+trap 'step ""; printf "\n== stage times\n"; printf "%s\n" "${times[@]}"' EXIT
+
+# The library and the tests alone, with the bit-exact tests and the scan for
+# fused multiply-adds.
+bitexact_build() {
+    local dir=$1
+    shift
+    cmake -S . -B "$dir" -DKESTACCEL_BUILD_BENCHMARKS=OFF -DKESTACCEL_BUILD_EXAMPLES=OFF -DKESTACCEL_INSTALL=OFF \
+        -DKESTACCEL_BUILD_TOOL=OFF -DKESTACCEL_BUILD_PYTHON=OFF "$@"
+    cmake --build "$dir" -j "$jobs"
+    ctest --test-dir "$dir" --output-on-failure --timeout 600 -j "$jobs" -L 'bitexact|isa'
+}
 
 step "release build and tests"
 cmake -S . -B build -DCMAKE_BUILD_TYPE=Release
@@ -41,14 +67,25 @@ ASAN_OPTIONS=detect_leaks=1:halt_on_error=1:handle_sigfpe=0 UBSAN_OPTIONS=halt_o
 
 for isa in x86-64-v3 x86-64-v4; do
     step "$isa build: the same bits as the baseline"
-    cmake -S . -B "build-$isa" -DCMAKE_BUILD_TYPE=Release -DKESTACCEL_ISA=$isa "-DCMAKE_CXX_FLAGS=-O3" \
-        -DKESTACCEL_BUILD_BENCHMARKS=OFF -DKESTACCEL_BUILD_EXAMPLES=OFF -DKESTACCEL_INSTALL=OFF \
-        -DKESTACCEL_BUILD_TOOL=OFF -DKESTACCEL_BUILD_PYTHON=OFF
-    cmake --build "build-$isa" -j "$jobs"
-    ctest --test-dir "build-$isa" --output-on-failure --timeout 600 -j "$jobs" -L 'bitexact|isa'
+    bitexact_build "build-$isa" -DCMAKE_BUILD_TYPE=Release -DKESTACCEL_ISA=$isa "-DCMAKE_CXX_FLAGS=-O3"
+done
+
+step "g++ -O0 build: the same bits unoptimised"
+bitexact_build build-O0 -DCMAKE_BUILD_TYPE=Debug
+
+scripts/install-deps.sh clang
+for isa in "" x86-64-v4; do
+    step "clang build${isa:+ for $isa}: the same bits from another compiler"
+    bitexact_build "build-clang${isa:+-$isa}" -DCMAKE_BUILD_TYPE=Release -DCMAKE_CXX_COMPILER=clang++ \
+        -DKESTACCEL_ISA=$isa
 done
 
 if [ "${KESTACCEL_SKIP_WINDOWS:-0}" != 1 ]; then
     step "Windows build (MinGW-w64), tests under Wine"
     scripts/test-windows.sh
+fi
+
+if [ "${KESTACCEL_SKIP_AARCH64:-0}" != 1 ]; then
+    step "Linux AArch64 build, bit-exact tests under qemu-user"
+    scripts/test-aarch64.sh
 fi

@@ -1,9 +1,13 @@
 # Per-file compile flags for kernels that need other optimisation settings
 # than the library's default (-O3). Each entry says why. The flags are GCC's
-# and Clang's; MSVC builds keep the defaults.
+# and Clang's; MSVC builds keep the defaults, and Debug builds their -O0.
 function(kestaccel_kernel_flags file)
+    set(flags ${ARGN})
+    if(CMAKE_BUILD_TYPE STREQUAL "Debug")
+        list(FILTER flags EXCLUDE REGEX "^-O")
+    endif()
     if(NOT MSVC)
-        set_source_files_properties(${CMAKE_CURRENT_SOURCE_DIR}/${file} PROPERTIES COMPILE_OPTIONS "${ARGN}")
+        set_source_files_properties(${CMAKE_CURRENT_SOURCE_DIR}/${file} PROPERTIES COMPILE_OPTIONS "${flags}")
     endif()
 endfunction()
 

@@ -7,6 +7,14 @@
 // index order, also when buffers overlap; each operation is rounded on its
 // own (no fused multiply-add, no reassociation). A count of 0 touches no
 // pointer.
+//
+// Results are the same bits on every supported build, except those that
+// come from the maths runtime (Exp, Ln, Pow, Round, Magnitude, the phase of
+// CartToPolar, PolarToCart), which agree wherever the runtimes agree. A
+// computed NaN is only promised to be a NaN: its sign and payload are open.
+// A NaN that is copied, moved, set, interleaved or selected by a comparison
+// keeps its bits, and so does the complex quotient's own NaN. See
+// docs/same-bits.md.
 
 #include <complex>
 
@@ -204,7 +212,9 @@ KESTACCEL_API void DivConstant_InPlace(unsigned int count, std::complex<double>*
 //                             (src[i] - offset) / divisor; no zero test
 //
 // A float member calls the single-precision runtime function, never the
-// double one on a widened value.
+// double one on a widened value. Exp, Ln, Pow, Round, Magnitude, the phase
+// of CartToPolar and PolarToCart give the runtime's bits, the same wherever
+// the runtimes agree; Sqrt is correctly rounded everywhere.
 //
 // Invert_Threshold_InPlace(n, srcDst, threshold) replaces each element by its
 // inverse, limited in size to 1 / threshold. Nothing happens when

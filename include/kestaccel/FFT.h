@@ -11,6 +11,9 @@ namespace transform {
 // Power-of-two Fourier transforms over opaque states. The forward transform
 // is unscaled, X[k] = sum x[n] exp(-2 pi i k n / N); the inverse carries the
 // whole 1/N. The size of a state is told by its order (log2 of the length).
+// Each twiddle table grows by a recurrence from one cos and one sin of the
+// runtime, so the transforms give the same bits wherever the runtimes agree
+// on those; FFTImpl also takes log2 from the runtime for its rounded order.
 
 // Creates a state of 1 << (order % 32) points and stores it in *state. A
 // null state pointer or order 0 does nothing: *state keeps what it held.

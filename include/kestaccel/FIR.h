@@ -66,6 +66,8 @@ KESTACCEL_API void FIRFree(FIRState_Float* state);
 // centre (the right half is taken to equal it) and centre is the middle tap
 // of an odd count, 0 for an even one: a positive S scales the sum to 1, a
 // negative one keeps its sign, and a zero one (cutoff 0) gives NaN taps.
+// The sines (and the cosines of the Hamming and Hann windows) are the
+// runtime's: the taps are the same bits wherever the runtimes agree.
 // workBuffer is never read or written and may be null.
 KESTACCEL_API void GenerateLowpassFIRCoefficients(double cutoff, unsigned int tapCount, double* taps,
                                                   utility::DSPWindowType windowType, bool normalize,

@@ -14,8 +14,9 @@ namespace utility {
 // transposition. The product is Eigen's, single-threaded, through maps of
 // the caller's buffers: each element is within 32 machine epsilons of the
 // naive sum for operands in [-1, 1], but its bits may depend on how Eigen
-// was built. c is written only once the product is complete, so it may be
-// the same buffer as a or b; the call allocates a temporary for that.
+// was built (its summation order follows the vector width). c is written
+// only once the product is complete, so it may be the same buffer as a or
+// b; the call allocates a temporary for that.
 // An order other than RowMajor (0) or ColMajor (1) leaves c untouched;
 // rows or cols of 0 write nothing; inner of 0 fills c with zeros.
 // Throws std::bad_alloc if the temporary cannot be had, before c is touched.

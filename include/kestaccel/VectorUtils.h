@@ -122,7 +122,8 @@ KESTACCEL_API void SetDenormalExceptionsEnabled(bool enable);
 // int to int24_t: an arithmetic right shift by the low five bits of scale
 // (the opposite sign of the floating exponents), then saturation.
 // int24_t to int: sign extension of bit 23, no shift.
-// float <-> double: plain IEEE conversions, no limit, no scale.
+// float <-> double: plain IEEE conversions, no limit, no scale; a NaN gives
+// a NaN, its payload not promised.
 //
 // These fifteen overloads are the whole set: there is no double to 8, 16 or
 // 24 bits, no 8- or 24-bit to double, and no short <-> int.

@@ -26,7 +26,9 @@ namespace utility {
 // float). Cosines are evaluated directly for each sample, with one
 // exception: the double WindowBlackman takes both cosines in single
 // precision, so its factors are only about float-accurate. The classic
-// Blackman window is alpha = -0.16.
+// Blackman window is alpha = -0.16. The cosines are the runtime's (cosf,
+// cos): Hann, Hamming and Blackman give the same bits wherever the runtimes
+// agree, Bartlett and Kaiser on every build.
 //
 // WindowKaiser's alpha multiplies the distance from the centre; the usual
 // shape parameter is alpha * (n - 1) / 2, so one alpha narrows as n grows.
