@@ -49,7 +49,8 @@ elementwise=src/utility/BasicMath/ElementwiseKernels.h
 runtime=src/utility/BasicMath/RuntimeMath.h
 m abs-fabs "Abs clears the sign of -0 and NaN" $elementwise 'dst[i] = T(0) > x ? -x : x;' 'dst[i] = std::fabs(x);'
 m exp-widened "float Exp through double exp" $runtime \
-  'inline float Exp(float x) { return ::expf(x); }' 'inline float Exp(float x) { return static_cast<float>(::exp(x)); }'
+  'inline float Exp(float x) { return ::expf(x); }' \
+  'inline float Exp(float x) { return static_cast<float>(::exp(static_cast<double>(x))); }'
 m round-to-even "Round ties to even" $runtime \
   'inline float Round(float x) { return ::roundf(x); }' 'inline float Round(float x) { return ::nearbyintf(x); }'
 m pow-operands "Pow takes b as the base" $elementwise 'runtime::Pow(a[i], b[i])' 'runtime::Pow(b[i], a[i])'
@@ -230,9 +231,8 @@ m fft-dc-negative-zero "real spectrum has -0 at DC's imaginary part" $fft/RealKe
   'dst[1] = E(0) + E(0);' 'dst[1] = -E(0);'
 m fft-combine-reassoc "real combine step reassociated" $fft/RealKernels.h \
   'dst[2 * k] = (wr * v.oRe + v.eRe) - v.oIm * wi;' 'dst[2 * k] = wr * v.oRe + (v.eRe - v.oIm * wi);'
-m fft-split-overlap "split transform sees only equal pointers as overlap" $fft/FFTInterfaceKernels.h \
-  $'const bool distinct = !Overlap(srcReal, dstReal, n) && !Overlap(srcReal, dstImag, n) &&\n                          !Overlap(srcImag, dstReal, n) && !Overlap(srcImag, dstImag, n);' \
-  'const bool distinct = srcReal != dstReal && srcImag != dstImag;'
+m fft-pairs-overlap "interleaved transform sees only equal pointers as overlap" $fft/FFTInterfaceKernels.h \
+  'if (!Overlap(from, to, count)) {' 'if (from != to) {'
 m fft-scratch-short "real plan reserves too little scratch" $fft/PlanKernels.h \
   'plan.forwardScratch.Reserve(2 * size + 2);' 'plan.forwardScratch.Reserve(size);'
 m fft-impl-ceil "FFTImpl rounds the length up" $fft/FFTImpl.cpp \
