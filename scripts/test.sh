@@ -20,13 +20,16 @@ cd "$(dirname "$0")/.."
 jobs=$(nproc)
 scripts/install-deps.sh
 
+# Each stage's wall time, and the processor time of its commands (on a busy
+# machine the second tells more).
+cpu() { local f; read -r -a f < /proc/$$/stat; echo $(( (f[15] + f[16]) / $(getconf CLK_TCK) )); }
 stage=""
-started=$SECONDS
 times=()
 step() {
-    [ -z "$stage" ] || times+=("$(printf '%6d s  %s' $((SECONDS - started)) "$stage")")
+    [ -z "$stage" ] || times+=("$(printf '%6d s %6d s cpu  %s' $((SECONDS - started)) $(($(cpu) - cpu0)) "$stage")")
     stage="$*"
     started=$SECONDS
+    cpu0=$(cpu)
     [ -z "$stage" ] || printf '\n== %s\n' "$*"
 }
 trap 'step ""; printf "\n== stage times\n"; printf "%s\n" "${times[@]}"' EXIT

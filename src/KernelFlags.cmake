@@ -65,8 +65,13 @@ kestaccel_kernel_flags(utility/BasicMath/ComplexArithmetic.cpp -fno-trapping-mat
 # the straight-line vectoriser, which that file does without. A package
 # test scans the library for fused instructions outside the matrix product.
 if(KESTACCEL_ISA MATCHES "v4|avx512")
-    # Eigen's AVX-512 headers trip g++ 12's -Wmaybe-uninitialized.
-    kestaccel_kernel_flags(utility/MatrixUtils/Multiply.cpp -mfma -Wno-maybe-uninitialized)
+    # Eigen's AVX-512 headers trip g++ 12's -Wmaybe-uninitialized (clang has
+    # no such warning).
+    set(quiet "")
+    if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
+        set(quiet -Wno-maybe-uninitialized)
+    endif()
+    kestaccel_kernel_flags(utility/MatrixUtils/Multiply.cpp -mfma ${quiet})
     kestaccel_kernel_flags(utility/BasicMath/ComplexArithmetic.cpp -fno-trapping-math -mno-avx512f)
     kestaccel_kernel_flags(transform/FFT/FFT.cpp -fno-tree-slp-vectorize)
 endif()
