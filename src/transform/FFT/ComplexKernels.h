@@ -90,10 +90,10 @@ struct FirstPassFactors {
 // half span of stage s: its 2^K streams, points j + p q (p < 2^K), meet
 // only each other. Stage s + i pairs streams p and p + 2^i (bit i of p
 // clear) with factor (p mod 2^i) q + j of that stage. The factors are
-// gathered from the strided table into split arrays, a chunk of kChunk
-// positions j at a time, so that every block of the pass reads them
-// contiguously: stage s + i holds 2^i rows, row r for p mod 2^i = r, at
-// row (2^i - 1 + r).
+// gathered from the strided table into split arrays, a chunk of up to
+// kChunk positions j at a time, so that every block of the pass reads them
+// contiguously: stage s + i holds 2^i rows (row r for p mod 2^i = r) of
+// `count` positions, one after the other from row 2^i - 1 on.
 constexpr std::size_t kChunk = 128;
 
 template <class E, unsigned int K>
@@ -103,16 +103,29 @@ struct FactorChunk {
     E im[kRows * kChunk];
 
     // The factors of positions first .. first + count - 1 of each row of
-    // stages s to s + stages - 1.
+    // stages s to s + stages - 1. When the chunk holds all q positions, the
+    // rows of a stage are its first 2^i q factors in order, and they are
+    // every other one of the next stage's (read at twice its stride): only
+    // the last stage is read from the table.
     void Gather(const FFTPlan<E>& plan, std::uint32_t s, unsigned int stages, std::size_t first, std::size_t count)
     {
+        if (stages == 0) return;
         const std::size_t q = std::size_t(1) << (s - 1);
+        if (count == q) {
+            const unsigned int last = stages - 1;
+            const std::size_t rows = std::size_t(1) << last;
+            GatherRow(plan.twiddles, rows * q, std::size_t(1) << (plan.order - s - last), re + (rows - 1) * q,
+                      im + (rows - 1) * q);
+            for (std::size_t r = rows / 2; r >= 1; r /= 2)
+                EveryOther(re + (2 * r - 1) * q, im + (2 * r - 1) * q, r * q, re + (r - 1) * q, im + (r - 1) * q);
+            return;
+        }
         for (unsigned int i = 0; i < stages; ++i) {
             const std::size_t stride = std::size_t(1) << (plan.order - s - i);
             for (std::size_t r = 0; r < (std::size_t(1) << i); ++r) {
                 const std::size_t row = (std::size_t(1) << i) - 1 + r;
-                GatherRow(plan.twiddles + 2 * (r * q + first) * stride, count, stride, re + row * kChunk,
-                          im + row * kChunk);
+                GatherRow(plan.twiddles + 2 * (r * q + first) * stride, count, stride, re + row * count,
+                          im + row * count);
             }
         }
     }
@@ -140,6 +153,14 @@ struct FactorChunk {
         for (std::size_t t = 0; t < count; ++t) {
             toRe[t] = from[2 * t * step];
             toIm[t] = from[2 * t * step + 1];
+        }
+    }
+
+    static void EveryOther(const E* fromRe, const E* fromIm, std::size_t count, E* toRe, E* toIm)
+    {
+        for (std::size_t t = 0; t < count; ++t) {
+            toRe[t] = fromRe[2 * t];
+            toIm[t] = fromIm[2 * t];
         }
     }
 };
@@ -195,7 +216,7 @@ template <class E, Form F, unsigned int K, Output kOut, bool kScale, bool kLastF
                             const std::size_t f = 2 * ((p & (h - 1)) * q + j + t);
                             Butterfly(xr[p], xi[p], xr[p + h], xi[p + h], tw[f], tw[f + 1]);
                         } else {
-                            const std::size_t f = (h - 1 + (p & (h - 1))) * kChunk + j + t;
+                            const std::size_t f = (h - 1 + (p & (h - 1))) * count + j + t;
                             Butterfly(xr[p], xi[p], xr[p + h], xi[p + h], fr[f], fi[f]);
                         }
                     }
