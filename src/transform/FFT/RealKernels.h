@@ -82,13 +82,13 @@ template <class E, std::size_t kLanes>
     }
 }
 
-// The bins below H/2 and above it, a vector's worth at a time where H/2
-// allows it, else two.
-template <class E>
+// The bins below H/2 and above it, kLanes at a time where H/2 allows it,
+// else two.
+template <class E, std::size_t kLanes>
 void Combine(std::size_t h, const E* zr, const E* zi, const E* w, E* dst)
 {
-    if (h / 2 >= kVectorLanes<E>) {
-        CombineBins<E, kVectorLanes<E>>(h, zr, zi, w, dst);
+    if (h / 2 >= kLanes) {
+        CombineBins<E, kLanes>(h, zr, zi, w, dst);
     } else if (h / 2 >= 2) {
         CombineBins<E, 2>(h, zr, zi, w, dst);
     }
@@ -103,7 +103,8 @@ bool RealCopyWraps(unsigned int size)
     return utility::cpp::ByteCountWraps<E>(size + 2);
 }
 
-template <class E>
+// kLanes is the block of the kernels, as in ComplexKernels.h.
+template <class E, std::size_t kLanes = kVectorLanes<E>>
 void RealFFTForward(FFTPlan<E>& plan, const E* src, E* dst)
 {
     const std::size_t n = plan.size;
@@ -130,7 +131,7 @@ void RealFFTForward(FFTPlan<E>& plan, const E* src, E* dst)
     E* zr = plan.forwardScratch.data();
     E* zi = zr + h + (h >= 16 ? 16 : 0);
     const FFTPlan<E>& half = *plan.halfPlan;
-    PairsToSplitForward(half, src, zr, zi);
+    PairsToSplitForward<E, kLanes>(half, src, zr, zi);
     if (RealCopyWraps<E>(plan.size)) {
         // Bin 0 alone: the rest of the spectrum would not be copied out.
         dst[0] = zr[0] + zi[0];
@@ -139,7 +140,7 @@ void RealFFTForward(FFTPlan<E>& plan, const E* src, E* dst)
     }
 
     const E* w = plan.twiddles;
-    Combine(h, zr, zi, w, dst);
+    Combine<E, kLanes>(h, zr, zi, w, dst);
     // The middle bin has o = (Z[Q].im, 0) and e = (Z[Q].re, 0).
     const E oRe = zi[q], eRe = zr[q], oIm = E(0), eIm = E(0);
     const E wr = w[2 * (q - 1)], wi = w[2 * (q - 1) + 1];
@@ -155,7 +156,7 @@ void RealFFTForward(FFTPlan<E>& plan, const E* src, E* dst)
 }
 
 // State is FFTState_Float or FFTState_Double; its plan is a real plan.
-template <class State, class E>
+template <class State, class E, std::size_t kLanes = kVectorLanes<E>>
 void RealFFTInverse(const E* src, E* dst, State* state)
 {
     FFTPlan<E>& plan = state->plan;
@@ -177,7 +178,7 @@ void RealFFTInverse(const E* src, E* dst, State* state)
     for (std::size_t k = h + 1; k < n; ++k) dst[k] = src[2 * (n - k)] - src[2 * (n - k) + 1];
     plan.inverseScratch.Resize(2 * plan.size + 2);
     E* y = plan.inverseScratch.data();
-    RealFFTForward(plan, dst, y);
+    RealFFTForward<E, kLanes>(plan, dst, y);
     for (std::size_t k = 0; k <= h; ++k) dst[k] = (y[2 * k + 1] + y[2 * k]) * scale;
     for (std::size_t k = h + 1; k < n; ++k) dst[k] = (y[2 * (n - k)] - y[2 * (n - k) + 1]) * scale;
 }
