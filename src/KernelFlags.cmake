@@ -61,9 +61,10 @@ kestaccel_kernel_flags(utility/BasicMath/ComplexArithmetic.cpp -fno-trapping-mat
 # the (re, im) of a complex product, into vfmaddsub/vfmsubadd even under
 # -ffp-contract=off and -mno-fma: the AVX-512 forms of those instructions do
 # not depend on the FMA flag. The complex products' loops stay at 256-bit
-# AVX2, where -mno-fma holds; the real FFT's combine loops only meet it in
-# the straight-line vectoriser, which that file does without. A package
-# test scans the library for fused instructions outside the matrix product.
+# AVX2, where -mno-fma holds. The FFT kernels need no flag: their loops run
+# across points, so a vector holds real parts or imaginary parts, never the
+# (re, im) pair the pattern needs. A package test scans the library for
+# fused instructions outside the matrix product.
 if(KESTACCEL_ISA MATCHES "v4|avx512")
     # Eigen's AVX-512 headers trip g++ 12's -Wmaybe-uninitialized (clang has
     # no such warning).
@@ -73,5 +74,4 @@ if(KESTACCEL_ISA MATCHES "v4|avx512")
     endif()
     kestaccel_kernel_flags(utility/MatrixUtils/Multiply.cpp -mfma ${quiet})
     kestaccel_kernel_flags(utility/BasicMath/ComplexArithmetic.cpp -fno-trapping-math -mno-avx512f)
-    kestaccel_kernel_flags(transform/FFT/FFT.cpp -fno-tree-slp-vectorize)
 endif()

@@ -7,22 +7,27 @@
 //
 // The butterflies of a stage are independent, so they run in an order that
 // suits the machine (Butterflies.h says why the bits stay the same):
-// - the permutation and stages 1 and 2 (or 1 to 3) run as one pass over
-//   groups of 4 (or 8) points held in locals (FirstPassKernels.h);
-// - later stages run in pairs: four points a quarter block apart pass
-//   through both stages before they are stored again, and the butterfly
-//   loop runs over consecutive points, so it vectorises;
+// - the permutation and the first stages run as one pass over groups of 8
+//   or 16 points held in locals (FirstPassKernels.h);
+// - the later stages run two or three at a time: the points that meet in
+//   those stages pass through all of them before they are stored again,
+//   and the butterfly loop runs over consecutive points, so it vectorises;
 // - the stages work on split arrays or on the blocked form, never on
-//   interleaved pairs, which would cost a shuffle per vector; the last pair
-//   of stages writes the result in the form the caller asked for, scaled
-//   there when the inverse needs it.
+//   interleaved pairs, which would cost a shuffle per vector; the last pass
+//   writes the result in the form the caller asked for, scaled there when
+//   the inverse needs it.
+// Transforms of one group (up to 8 or 16 points) take all their stages in
+// locals and write the result directly.
+//
+// kLanes, the points of a block, is one vector of the build's width
+// (kVectorLanes) unless a test asks for another: the results are the same
+// bits for every width.
 //
 // The loop kernels are kept out of line: inlined into their caller, g++
 // loses what their restrict parameters promise and leaves them scalar.
 
 #include <cstddef>
 #include <cstdint>
-#include <type_traits>
 
 #include "transform/FFT/Butterflies.h"
 #include "transform/FFT/FFTPlan.h"
@@ -31,239 +36,270 @@
 namespace kestaccel {
 namespace transform {
 namespace cpp {
+inline namespace KESTACCEL_FFT_WIDTH_NAMESPACE {
 
-// The factors of a stage are gathered from the strided table into small
-// split arrays, a chunk of kChunk butterfly positions at a time, so that
-// every block of the stage reads them contiguously.
+// The first pass takes the first log2(span) stages, where span, the points
+// that meet in them, is a block at least (the later stages pair points a
+// block apart or more) and 4 at least. With blocks of 4 or fewer it takes a
+// stage more when that saves a pass; wider, the 16 points of a group would
+// not fit in the registers. It works on groups of 8 points at least, the
+// fewest whose stored points fill a cache line, and its stages run across a
+// run of groups, one vector's worth (at least 4).
+template <std::size_t kLanes>
+constexpr std::size_t kNarrowSpan = kLanes > 4 ? kLanes : 4;
+template <std::size_t kLanes>
+constexpr std::size_t kWideSpan = kLanes > 4 ? kNarrowSpan<kLanes> : 2 * kNarrowSpan<kLanes>;
+template <std::size_t kSpan>
+constexpr std::size_t kGroupPoints = kSpan > 8 ? kSpan : 8;
+template <std::size_t kLanes>
+constexpr std::size_t kRunGroups = kLanes > 4 ? kLanes : 4;
+
+// Passes over the data for the stages after the first pass: three stages
+// at a time (RemainingStages).
+constexpr unsigned int PassesFor(unsigned int stages) { return (stages + 2) / 3; }
+
+template <std::size_t kLanes>
+bool WideFirstPass(std::uint32_t order)
+{
+    constexpr unsigned int narrow = Log2(kNarrowSpan<kLanes>), wide = Log2(kWideSpan<kLanes>);
+    return wide > narrow && PassesFor(order - wide) < PassesFor(order - narrow);
+}
+
+// The factors of stages 3 onwards of a first pass of kGroup points, read
+// from the table (stage s at a stride of N / 2^s), as FirstStages takes
+// them.
+template <class E>
+struct FirstPassFactors {
+    E w[2 * (4 + 8)] = {};
+
+    FirstPassFactors(const FFTPlan<E>& plan, std::size_t group)
+    {
+        E* to = w;
+        for (std::uint32_t s = 3; (std::size_t(1) << s) <= group; ++s) {
+            const std::size_t half = std::size_t(1) << (s - 1), stride = std::size_t(1) << (plan.order - s);
+            for (std::size_t j = 0; j < half; ++j) {
+                to[2 * j] = plan.twiddles[2 * j * stride];
+                to[2 * j + 1] = plan.twiddles[2 * j * stride + 1];
+            }
+            to += 2 * half;
+        }
+    }
+};
+
+// A pass takes stages s to s + K - 1 over blocks of 2^K q points, q the
+// half span of stage s: its 2^K streams, points j + p q (p < 2^K), meet
+// only each other. Stage s + i pairs streams p and p + 2^i (bit i of p
+// clear) with factor (p mod 2^i) q + j of that stage. The factors are
+// gathered from the strided table into split arrays, a chunk of up to
+// kChunk positions j at a time, so that every block of the pass reads them
+// contiguously: stage s + i holds 2^i rows (row r for p mod 2^i = r) of
+// `count` positions, one after the other from row 2^i - 1 on.
 constexpr std::size_t kChunk = 128;
 
-template <class E>
+template <class E, unsigned int K>
 struct FactorChunk {
-    E re[kChunk];
-    E im[kChunk];
+    static constexpr std::size_t kRows = (std::size_t(1) << K) - 1;
+    E re[kRows * kChunk];
+    E im[kRows * kChunk];
 
-    // Pairs first, first + 1, ... of the table at the given stride. The
-    // strides of the last stages, 1 and 2, are spelled out: as constants
-    // they give g++ a plain deinterleaving loop.
-    void Gather(const E* tw, std::size_t first, std::size_t count, std::size_t stride)
+    // The factors of positions first .. first + count - 1 of each row of
+    // stages s to s + stages - 1. When the chunk holds all q positions, the
+    // rows of a stage are its first 2^i q factors in order, and they are
+    // every other one of the next stage's (read at twice its stride): only
+    // the last stage is read from the table.
+    void Gather(const FFTPlan<E>& plan, std::uint32_t s, unsigned int stages, std::size_t first, std::size_t count)
     {
-        if (stride == 1) {
-            GatherAt<1>(tw + 2 * first, count, 1);
-        } else if (stride == 2) {
-            GatherAt<2>(tw + 4 * first, count, 2);
-        } else {
-            GatherAt<0>(tw + 2 * first * stride, count, stride);
+        if (stages == 0) return;
+        const std::size_t q = std::size_t(1) << (s - 1);
+        if (count == q) {
+            const unsigned int last = stages - 1;
+            const std::size_t rows = std::size_t(1) << last;
+            GatherRow(plan.twiddles, rows * q, std::size_t(1) << (plan.order - s - last), re + (rows - 1) * q,
+                      im + (rows - 1) * q);
+            for (std::size_t r = rows / 2; r >= 1; r /= 2)
+                EveryOther(re + (2 * r - 1) * q, im + (2 * r - 1) * q, r * q, re + (r - 1) * q, im + (r - 1) * q);
+            return;
+        }
+        for (unsigned int i = 0; i < stages; ++i) {
+            const std::size_t stride = std::size_t(1) << (plan.order - s - i);
+            for (std::size_t r = 0; r < (std::size_t(1) << i); ++r) {
+                const std::size_t row = (std::size_t(1) << i) - 1 + r;
+                GatherRow(plan.twiddles + 2 * (r * q + first) * stride, count, stride, re + row * count,
+                          im + row * count);
+            }
         }
     }
 
-    // The q factors of stage s from the 2q of stage s + 1, held whole in b
-    // (the first q) and c (the next q): stage s reads the table at twice the
-    // stride, so its factors are every other one of those.
-    void EveryOtherOf(const FactorChunk& b, const FactorChunk& c, std::size_t q)
+    // The strides of the last stages, 1, 2 and 4, are spelled out: as
+    // constants they give g++ a plain deinterleaving loop.
+    static void GatherRow(const E* from, std::size_t count, std::size_t stride, E* toRe, E* toIm)
     {
-        const std::size_t half = q / 2;
-        for (std::size_t t = 0; t < half; ++t) {
-            re[t] = b.re[2 * t];
-            im[t] = b.im[2 * t];
-        }
-        for (std::size_t t = 0; t < half; ++t) {
-            re[half + t] = c.re[2 * t];
-            im[half + t] = c.im[2 * t];
+        switch (stride) {
+        case 1:
+            return GatherAt<1>(from, count, 1, toRe, toIm);
+        case 2:
+            return GatherAt<2>(from, count, 2, toRe, toIm);
+        case 4:
+            return GatherAt<4>(from, count, 4, toRe, toIm);
+        default:
+            return GatherAt<0>(from, count, stride, toRe, toIm);
         }
     }
 
     template <std::size_t kStride>
-    void GatherAt(const E* from, std::size_t count, std::size_t stride)
+    static void GatherAt(const E* from, std::size_t count, std::size_t stride, E* toRe, E* toIm)
     {
         const std::size_t step = kStride != 0 ? kStride : stride;
         for (std::size_t t = 0; t < count; ++t) {
-            re[t] = from[2 * t * step];
-            im[t] = from[2 * t * step + 1];
+            toRe[t] = from[2 * t * step];
+            toIm[t] = from[2 * t * step + 1];
+        }
+    }
+
+    static void EveryOther(const E* fromRe, const E* fromIm, std::size_t count, E* toRe, E* toIm)
+    {
+        for (std::size_t t = 0; t < count; ++t) {
+            toRe[t] = fromRe[2 * t];
+            toIm[t] = fromIm[2 * t];
         }
     }
 };
 
-// Where a pair of stages leaves its result: over the working array in its
-// own form; over it as interleaved pairs (a block covers the same bytes as
-// its points in pairs); or in separate split arrays. Only the last pair
-// writes anything but kInPlace. With kScale the real parts are multiplied
-// by scale and the imaginary parts by -scale, which undoes the inverse's
+// Where a pass leaves its result: over the working array in its own form;
+// over it as interleaved pairs (a block covers the same bytes as its
+// points in pairs); or in separate split arrays. Only the last pass writes
+// anything but kInPlace. With kScale the real parts are multiplied by scale
+// and the imaginary parts by -scale, which undoes the inverse's
 // conjugation and divides by N in one step.
 enum class Output { kInPlace, kPairsInPlace, kSplitArrays };
 
-template <class E, Form F, Output kOut, bool kScale>
-struct Writer {
-    E scale;
-    E negScale;
-
-    // Point start + t of a stream held at re/im in the working array; the
-    // split output of that stream starts at outRe/outIm.
-    void Put(E* re, E* im, E* outRe, E* outIm, std::size_t start, std::size_t t, E xr, E xi) const
-    {
-        const E yr = kScale ? xr * scale : xr;
-        const E yi = kScale ? xi * negScale : xi;
-        if constexpr (kOut == Output::kInPlace) {
-            Points<E, F>::Re(re, im, start, t) = yr;
-            Points<E, F>::Im(re, im, start, t) = yi;
-        } else if constexpr (kOut == Output::kPairsInPlace) {
-            Points<E, Form::kPairs>::Re(re, im, start, t) = yr;
-            Points<E, Form::kPairs>::Im(re, im, start, t) = yi;
-        } else {
-            outRe[start + t] = yr;
-            outIm[start + t] = yi;
-        }
-    }
-};
-
-// Two consecutive stages s and s + 1 over blocks of 4q points, q the half
-// span of stage s. Points j, j + q, j + 2q, j + 3q: stage s pairs the first
-// two and the last two with factor a[j]; stage s + 1 then pairs j with
-// j + 2q (factor b[j]) and j + q with j + 3q (factor c[j]). The four
-// streams start at r0 .. r3 (and i0 .. i3 in the split form), their split
-// outputs, if any, at o0r/o0i .. o3r/o3i. Each block of kLanes points is
-// read whole before anything is written, since the pair output rewrites
-// the bytes of the block in another order.
-template <class E, Form F, Output kOut, bool kScale>
-[[gnu::noinline]] void StagePairRun(std::size_t blocks, std::size_t span, std::size_t count, E* __restrict r0,
-                                    E* __restrict i0, E* __restrict r1, E* __restrict i1, E* __restrict r2,
-                                    E* __restrict i2, E* __restrict r3, E* __restrict i3, const E* __restrict ar_,
-                                    const E* __restrict ai_, const E* __restrict br_, const E* __restrict bi_,
-                                    const E* __restrict cr_, const E* __restrict ci_, E* __restrict o0r,
-                                    E* __restrict o0i, E* __restrict o1r, E* __restrict o1i, E* __restrict o2r,
-                                    E* __restrict o2i, E* __restrict o3r, E* __restrict o3i, E scale)
+// Stages s to s + K - 1 over `blocks` blocks of span points, for the
+// positions j below count (a multiple of kLanes) of the chunk that re/im
+// (and outRe/outIm) start at. The factors are those of the chunk; with
+// kLastFromTable the last stage's come from the table instead, which holds
+// them in order when that stage is the transform's last (pairs at stride
+// 1, tw at the chunk's first one): deinterleaved as they are loaded, they
+// cost no gathering. The
+// loop over the lanes of a block holds each lane's 2^K points in locals;
+// lanes touch distinct elements, so it vectorises whole. A pair output
+// rewrites the bytes of a block in another order, so its blocks are all
+// read before any is written.
+template <class E, Form F, unsigned int K, Output kOut, bool kScale, bool kLastFromTable, std::size_t kLanes>
+[[gnu::noinline]] void StagesRun(std::size_t blocks, std::size_t span, std::size_t q, std::size_t count,
+                                 E* __restrict re, E* __restrict im, const E* __restrict fr,
+                                 const E* __restrict fi, const E* __restrict tw, E* __restrict outRe,
+                                 E* __restrict outIm, E scale)
 {
-    using P = Points<E, F>;
-    constexpr std::size_t lanes = kLanes<E>;
-    const Writer<E, F, kOut, kScale> out{scale, -scale};
+    using P = Points<E, F, kLanes>;
+    constexpr std::size_t kStreams = std::size_t(1) << K;
+    const E negScale = -scale;
     for (std::size_t b = 0; b < blocks; ++b) {
-        const std::size_t o = b * span;
-        for (std::size_t j = 0; j < count; j += lanes) {
-            const std::size_t k = o + j;
-            E ar[lanes], ai[lanes], br[lanes], bi[lanes], cr[lanes], ci[lanes], dr[lanes], di[lanes];
-            for (std::size_t t = 0; t < lanes; ++t) {
-                ar[t] = P::Re(r0, i0, k, t), ai[t] = P::Im(r0, i0, k, t), br[t] = P::Re(r1, i1, k, t);
-                bi[t] = P::Im(r1, i1, k, t), cr[t] = P::Re(r2, i2, k, t), ci[t] = P::Im(r2, i2, k, t);
-                dr[t] = P::Re(r3, i3, k, t), di[t] = P::Im(r3, i3, k, t);
+        for (std::size_t j = 0; j < count; j += kLanes) {
+            const std::size_t k = b * span + j;
+            E pairRe[kOut == Output::kPairsInPlace ? kStreams : 1][kLanes];
+            E pairIm[kOut == Output::kPairsInPlace ? kStreams : 1][kLanes];
+            KESTACCEL_FFT_INDEPENDENT_LANES
+            for (std::size_t t = 0; t < kLanes; ++t) {
+                E xr[kStreams], xi[kStreams];
+                KESTACCEL_FFT_UNROLL(8)
+                for (std::size_t p = 0; p < kStreams; ++p) {
+                    xr[p] = P::Re(re, im, k + p * q, t);
+                    xi[p] = P::Im(re, im, k + p * q, t);
+                }
+                KESTACCEL_FFT_UNROLL(3)
+                for (unsigned int i = 0; i < K; ++i) {
+                    const std::size_t h = std::size_t(1) << i;
+                    KESTACCEL_FFT_UNROLL(8)
+                    for (std::size_t p = 0; p < kStreams; ++p) {
+                        if ((p & h) != 0) continue;
+                        if (kLastFromTable && i + 1 == K) {
+                            const std::size_t f = 2 * ((p & (h - 1)) * q + j + t);
+                            Butterfly(xr[p], xi[p], xr[p + h], xi[p + h], tw[f], tw[f + 1]);
+                        } else {
+                            const std::size_t f = (h - 1 + (p & (h - 1))) * count + j + t;
+                            Butterfly(xr[p], xi[p], xr[p + h], xi[p + h], fr[f], fi[f]);
+                        }
+                    }
+                }
+                KESTACCEL_FFT_UNROLL(8)
+                for (std::size_t p = 0; p < kStreams; ++p) {
+                    const E yr = kScale ? xr[p] * scale : xr[p];
+                    const E yi = kScale ? xi[p] * negScale : xi[p];
+                    if constexpr (kOut == Output::kInPlace) {
+                        P::Re(re, im, k + p * q, t) = yr;
+                        P::Im(re, im, k + p * q, t) = yi;
+                    } else if constexpr (kOut == Output::kSplitArrays) {
+                        outRe[k + p * q + t] = yr;
+                        outIm[k + p * q + t] = yi;
+                    } else {
+                        pairRe[p][t] = yr;
+                        pairIm[p][t] = yi;
+                    }
+                }
             }
-            for (std::size_t t = 0; t < lanes; ++t) {
-                const std::size_t u = j + t;
-                Butterfly(ar[t], ai[t], br[t], bi[t], ar_[u], ai_[u]);
-                Butterfly(cr[t], ci[t], dr[t], di[t], ar_[u], ai_[u]);
-                Butterfly(ar[t], ai[t], cr[t], ci[t], br_[u], bi_[u]);
-                Butterfly(br[t], bi[t], dr[t], di[t], cr_[u], ci_[u]);
-            }
-            for (std::size_t t = 0; t < lanes; ++t) {
-                out.Put(r0, i0, o0r, o0i, k, t, ar[t], ai[t]);
-                out.Put(r1, i1, o1r, o1i, k, t, br[t], bi[t]);
-                out.Put(r2, i2, o2r, o2i, k, t, cr[t], ci[t]);
-                out.Put(r3, i3, o3r, o3i, k, t, dr[t], di[t]);
+            if constexpr (kOut == Output::kPairsInPlace) {
+                KESTACCEL_FFT_UNROLL(8)
+                for (std::size_t p = 0; p < kStreams; ++p) {
+                    // Left a loop: the loop vectoriser interleaves it with
+                    // shuffles, which it does not do once it is unrolled.
+                    KESTACCEL_FFT_UNROLL(1)
+                    for (std::size_t t = 0; t < kLanes; ++t) {
+                        re[2 * (k + p * q + t)] = pairRe[p][t];
+                        re[2 * (k + p * q + t) + 1] = pairIm[p][t];
+                    }
+                }
             }
         }
     }
 }
 
-// Split parts of count points into pairs.
-template <class E>
-[[gnu::noinline]] void InterleaveParts(std::size_t count, const E* __restrict re, const E* __restrict im,
-                                       E* __restrict pairs)
+// Stages s to s + K - 1 over the whole working array, a chunk of factors at
+// a time; kLast when they end with the transform's last stage.
+template <class E, Form F, unsigned int K, Output kOut, bool kScale, bool kLast, std::size_t kLanes>
+void StagesPass(const FFTPlan<E>& plan, std::uint32_t s, E* re, E* im, E* outRe, E* outIm, E scale)
 {
-    for (std::size_t k = 0; k < count; ++k) {
-        pairs[2 * k] = re[k];
-        pairs[2 * k + 1] = im[k];
-    }
-}
-
-// Stages s and s + 1; the last pair (s + 1 = order) writes the output.
-// Pairs go through split arrays on the stack, a chunk at a time, and are
-// interleaved from there: written by the butterfly loop itself, they make
-// g++ arrange the whole loop around interleaved vectors, with twice the
-// instructions. The pairs of a chunk's points cover the bytes of the same
-// points in the blocked form, which no other chunk reads.
-template <class E, Form F, Output kOut, bool kScale>
-void StagePair(const FFTPlan<E>& plan, std::uint32_t s, E* re, E* im, E* outRe, E* outIm, E scale)
-{
-    using P = Points<E, F>;
     static_assert(kOut != Output::kPairsInPlace || F == Form::kBlocked, "pairs come from the blocked form");
-    const std::size_t n = plan.size;
-    const std::size_t q = std::size_t(1) << (s - 1);
-    const std::size_t strideB = std::size_t(1) << (plan.order - s - 1);
-    // Output streams exist only for split arrays; null pointers stay unused.
-    const auto at = [](E* p, std::size_t k) { return p == nullptr ? p : p + k; };
-    FactorChunk<E> a, b, c;
+    using P = Points<E, F, kLanes>;
+    const std::size_t q = std::size_t(1) << (s - 1), span = q << K;
+    FactorChunk<E, K> factors;
     for (std::size_t j0 = 0; j0 < q; j0 += kChunk) {
         const std::size_t count = q - j0 < kChunk ? q - j0 : kChunk;
-        b.Gather(plan.twiddles, j0, count, strideB);
-        c.Gather(plan.twiddles, j0 + q, count, strideB);
-        if (q <= kChunk) a.EveryOtherOf(b, c, q);
-        else a.Gather(plan.twiddles, j0, count, 2 * strideB);
-        const std::size_t o0 = P::Offset(j0), o1 = P::Offset(j0 + q), o2 = P::Offset(j0 + 2 * q),
-                          o3 = P::Offset(j0 + 3 * q);
-        if constexpr (kOut == Output::kPairsInPlace) {
-            // Only the last pair writes pairs, and it spans one block.
-            E partsRe[4][kChunk], partsIm[4][kChunk];
-            StagePairRun<E, F, Output::kSplitArrays, kScale>(
-                1, 4 * q, count, re + o0, im + o0, re + o1, im + o1, re + o2, im + o2, re + o3, im + o3, a.re, a.im,
-                b.re, b.im, c.re, c.im, partsRe[0], partsIm[0], partsRe[1], partsIm[1], partsRe[2], partsIm[2],
-                partsRe[3], partsIm[3], scale);
-            for (std::size_t m = 0; m < 4; ++m) InterleaveParts(count, partsRe[m], partsIm[m], re + 2 * (j0 + m * q));
-        } else {
-            StagePairRun<E, F, kOut, kScale>(n >> (s + 1), 4 * q, count, re + o0, im + o0, re + o1, im + o1,
-                                             re + o2, im + o2, re + o3, im + o3, a.re, a.im, b.re, b.im, c.re, c.im,
-                                             at(outRe, j0), at(outIm, j0), at(outRe, j0 + q), at(outIm, j0 + q),
-                                             at(outRe, j0 + 2 * q), at(outIm, j0 + 2 * q), at(outRe, j0 + 3 * q),
-                                             at(outIm, j0 + 3 * q), scale);
-        }
+        factors.Gather(plan, s, kLast ? K - 1 : K, j0, count);
+        // Output arrays exist only for split output; null ones stay unused.
+        E* const toRe = outRe == nullptr ? outRe : outRe + j0;
+        E* const toIm = outIm == nullptr ? outIm : outIm + j0;
+        StagesRun<E, F, K, kOut, kScale, kLast, kLanes>(plan.size / span, span, q, count, re + P::Offset(j0),
+                                                        im + P::Offset(j0), factors.re, factors.im,
+                                                        plan.twiddles + 2 * j0, toRe, toIm, scale);
     }
 }
 
-// When the first pass took every stage (4 or 8 points), only the output
-// step remains.
-template <class E, Form F, Output kOut, bool kScale>
-[[gnu::noinline]] void WriteOut(std::size_t n, E* __restrict re, E* __restrict im, E* __restrict outRe,
-                                E* __restrict outIm, E scale)
-{
-    using P = Points<E, F>;
-    constexpr std::size_t lanes = kLanes<E>;
-    const Writer<E, F, kOut, kScale> out{scale, -scale};
-    for (std::size_t j = 0; j < n; j += lanes) {
-        E xr[lanes], xi[lanes];
-        for (std::size_t t = 0; t < lanes; ++t) {
-            xr[t] = P::Re(re, im, j, t);
-            xi[t] = P::Im(re, im, j, t);
-        }
-        for (std::size_t t = 0; t < lanes; ++t) out.Put(re, im, outRe, outIm, j, t, xr[t], xi[t]);
-    }
-}
-
-// The stages from s on, on the working array after the first pass; the
-// last pair writes the output.
-template <class E, Form F, Output kOut, bool kScale>
+// The stages from s on, after the first pass, three at a time while more
+// than four are left, then two at a time (one when one is left): fewer
+// passes over the data, each with its points in registers. The last pass
+// writes the output.
+template <class E, Form F, Output kOut, bool kScale, std::size_t kLanes>
 void RemainingStages(const FFTPlan<E>& plan, std::uint32_t s, E* re, E* im, E* outRe, E* outIm, E scale)
 {
-    if (s > plan.order) {
-        if (kOut != Output::kInPlace || kScale) WriteOut<E, F, kOut, kScale>(plan.size, re, im, outRe, outIm, scale);
-        return;
-    }
-    for (; s + 1 < plan.order; s += 2) StagePair<E, F, Output::kInPlace, false>(plan, s, re, im, nullptr, nullptr, scale);
-    StagePair<E, F, kOut, kScale>(plan, s, re, im, outRe, outIm, scale);
-}
-
-// The four stage-3 factors of a plan (at an eighth of its table apart), for
-// the first pass of an odd order.
-template <class E>
-struct StageThreeFactors {
-    E w[8] = {};
-
-    explicit StageThreeFactors(const FFTPlan<E>& plan)
-    {
-        if ((plan.order & 1u) == 0) return;
-        const std::size_t stride = std::size_t(1) << (plan.order - 3);
-        for (std::size_t t = 0; t < 4; ++t) {
-            w[2 * t] = plan.twiddles[2 * t * stride];
-            w[2 * t + 1] = plan.twiddles[2 * t * stride + 1];
+    for (;;) {
+        switch (plan.order + 1 - s) {
+        case 1:
+            return StagesPass<E, F, 1, kOut, kScale, true, kLanes>(plan, s, re, im, outRe, outIm, scale);
+        case 2:
+            return StagesPass<E, F, 2, kOut, kScale, true, kLanes>(plan, s, re, im, outRe, outIm, scale);
+        case 3:
+            return StagesPass<E, F, 3, kOut, kScale, true, kLanes>(plan, s, re, im, outRe, outIm, scale);
+        case 4:
+            StagesPass<E, F, 2, Output::kInPlace, false, false, kLanes>(plan, s, re, im, nullptr, nullptr, scale);
+            s += 2;
+            break;
+        default:
+            StagesPass<E, F, 3, Output::kInPlace, false, false, kLanes>(plan, s, re, im, nullptr, nullptr, scale);
+            s += 3;
+            break;
         }
     }
-};
+}
 
 // Transforms of 2 points: one butterfly, with the inverse's conjugation
 // and scaling around it.
@@ -283,91 +319,142 @@ void TwoPoints(const E* srcRe, const E* srcIm, std::size_t srcStep, E* re, E* im
     im[step] = kInverse ? yi * negScale : yi;
 }
 
-// The first pass, by groups of 4 points for even orders and 8 for odd ones
-// (so that an even number of stages remains for the pairs), then the
-// remaining stages. firstPass(group, w) runs the pass for that group size.
-template <class E, Form F, Output kOut, bool kInverse, class FirstPassFn>
-void StagesFrom(const FFTPlan<E>& plan, E* re, E* im, E* outRe, E* outIm, FirstPassFn firstPass)
+// A transform of kGroup points (4 to 16) in locals: every point is read
+// before any is written, so the source may be the destination.
+template <class E, Form kSrc, Form kDst, bool kInverse, std::size_t kGroup>
+[[gnu::noinline]] void OneGroup(const FFTPlan<E>& plan, const E* srcRe, const E* srcIm, E* dstRe, E* dstIm)
 {
-    const StageThreeFactors<E> factors(plan);
-    const E scale = E(1) / static_cast<E>(plan.size);
-    if ((plan.order & 1u) == 0) {
-        firstPass(std::integral_constant<std::size_t, 4>{}, factors.w);
-        RemainingStages<E, F, kOut, kInverse>(plan, 3, re, im, outRe, outIm, scale);
-    } else {
-        firstPass(std::integral_constant<std::size_t, 8>{}, factors.w);
-        RemainingStages<E, F, kOut, kInverse>(plan, 4, re, im, outRe, outIm, scale);
+    E r[kGroup], m[kGroup];
+    for (std::size_t t = 0; t < kGroup; ++t) {
+        const std::size_t p = ReversedPosition<kGroup>(t);
+        r[t] = Points<E, kSrc, 1>::Re(srcRe, srcIm, p, 0);
+        m[t] = kInverse ? -Points<E, kSrc, 1>::Im(srcRe, srcIm, p, 0) : Points<E, kSrc, 1>::Im(srcRe, srcIm, p, 0);
+    }
+    const FirstPassFactors<E> factors(plan, kGroup);
+    FirstStages<E, kGroup, kGroup>(r, m, factors.w);
+    const E scale = E(1) / static_cast<E>(kGroup), negScale = -scale;
+    for (std::size_t t = 0; t < kGroup; ++t) {
+        Points<E, kDst, 1>::Re(dstRe, dstIm, t, 0) = kInverse ? r[t] * scale : r[t];
+        Points<E, kDst, 1>::Im(dstRe, dstIm, t, 0) = kInverse ? m[t] * negScale : m[t];
     }
 }
 
-// The transform of plan.size points read from a distinct source in form
-// kSrc, worked on in re/im in form F and left as kOut says. One point is
-// copied as it is; two take a single butterfly.
-template <class E, Form kSrc, Form F, Output kOut, bool kInverse>
+// The transforms of up to 16 points, from a source in form kSrc into a
+// destination in form kDst (pairs or split): one point is copied as it is,
+// two take a single butterfly, more take one group.
+template <class E, Form kSrc, Form kDst, bool kInverse>
+void SmallTransform(const FFTPlan<E>& plan, const E* srcRe, const E* srcIm, E* dstRe, E* dstIm)
+{
+    switch (plan.size) {
+    case 1:
+        dstRe[0] = srcRe[0];
+        dstIm[0] = srcIm[0];
+        break;
+    case 2:
+        TwoPoints<E, kInverse>(srcRe, srcIm, Points<E, kSrc, 1>::Offset(1), dstRe, dstIm,
+                               Points<E, kDst, 1>::Offset(1));
+        break;
+    case 4:
+        OneGroup<E, kSrc, kDst, kInverse, 4>(plan, srcRe, srcIm, dstRe, dstIm);
+        break;
+    case 8:
+        OneGroup<E, kSrc, kDst, kInverse, 8>(plan, srcRe, srcIm, dstRe, dstIm);
+        break;
+    default:
+        OneGroup<E, kSrc, kDst, kInverse, 16>(plan, srcRe, srcIm, dstRe, dstIm);
+        break;
+    }
+}
+
+// Up to 16 points, the transform is done in locals.
+template <class E>
+bool IsSmall(const FFTPlan<E>& plan)
+{
+    return plan.size <= 16;
+}
+
+// The transform of plan.size points (more than 16) read from a distinct
+// source in form kSrc, worked on in re/im in form F and left as kOut says,
+// with a first pass of kSpan.
+template <class E, Form kSrc, Form F, Output kOut, bool kInverse, std::size_t kLanes, std::size_t kSpan>
+void TransformWithSpan(const FFTPlan<E>& plan, const E* srcRe, const E* srcIm, E* re, E* im, E* outRe, E* outIm)
+{
+    const FirstPassFactors<E> factors(plan, kSpan);
+    FirstPass<E, kSrc, F, kInverse, kGroupPoints<kSpan>, kSpan, kLanes, kRunGroups<kLanes>>(plan.order, srcRe, srcIm,
+                                                                                          re, im, factors.w);
+    const E scale = E(1) / static_cast<E>(plan.size);
+    RemainingStages<E, F, kOut, kInverse, kLanes>(plan, Log2(kSpan) + 1, re, im, outRe, outIm, scale);
+}
+
+template <class E, Form kSrc, Form F, Output kOut, bool kInverse, std::size_t kLanes>
 void TransformFrom(const FFTPlan<E>& plan, const E* srcRe, const E* srcIm, E* re, E* im, E* outRe, E* outIm)
 {
-    if (plan.size <= 2) {
-        E* finalRe = kOut == Output::kSplitArrays ? outRe : re;
-        E* finalIm = kOut == Output::kSplitArrays ? outIm : kOut == Output::kPairsInPlace ? re + 1 : im;
-        const std::size_t finalStep = kOut == Output::kPairsInPlace ? 2 : 1;
-        if (plan.size == 1) {
-            finalRe[0] = srcRe[0];
-            finalIm[0] = srcIm[0];
-        } else {
-            TwoPoints<E, kInverse>(srcRe, srcIm, Points<E, kSrc>::Offset(1), finalRe, finalIm, finalStep);
-        }
-        return;
+    if (WideFirstPass<kLanes>(plan.order)) {
+        TransformWithSpan<E, kSrc, F, kOut, kInverse, kLanes, kWideSpan<kLanes>>(plan, srcRe, srcIm, re, im, outRe,
+                                                                                 outIm);
+    } else {
+        TransformWithSpan<E, kSrc, F, kOut, kInverse, kLanes, kNarrowSpan<kLanes>>(plan, srcRe, srcIm, re, im, outRe,
+                                                                                   outIm);
     }
-    StagesFrom<E, F, kOut, kInverse>(plan, re, im, outRe, outIm, [&](auto group, const E* w) {
-        FirstPass<E, kSrc, F, kInverse, decltype(group)::value>(plan.order, srcRe, srcIm, re, im, w);
-    });
+}
+
+// In place after the swap-table exchanges, each group of the first pass
+// turned into the blocked form over its own bytes.
+template <class E, bool kInverse, std::size_t kLanes, std::size_t kSpan>
+void PairsInPlaceWithSpan(const FFTPlan<E>& plan, E* pairs)
+{
+    constexpr std::size_t kGroup = kGroupPoints<kSpan>;
+    const FirstPassFactors<E> factors(plan, kSpan);
+    FirstStagesInPlace<E, kInverse, kGroup, kSpan, kLanes>(plan.size / kGroup, pairs, factors.w);
+    const E scale = E(1) / static_cast<E>(plan.size);
+    RemainingStages<E, Form::kBlocked, Output::kPairsInPlace, kInverse, kLanes>(plan, Log2(kSpan) + 1, pairs, pairs,
+                                                                                 nullptr, nullptr, scale);
 }
 
 // Interleaved pairs in place: the swap-table exchanges, then the same
 // stages, the first pass turning each group into the blocked form.
-template <class E, bool kInverse>
+template <class E, bool kInverse, std::size_t kLanes = kVectorLanes<E>>
 void PairsInPlace(const FFTPlan<E>& plan, E* pairs)
 {
-    const std::size_t n = plan.size;
-    if (n == 1) return;
-    if (n == 2) {
-        TwoPoints<E, kInverse>(pairs, pairs + 1, 2, pairs, pairs + 1, 2);
-        return;
+    if (IsSmall(plan)) return SmallTransform<E, Form::kPairs, Form::kPairs, kInverse>(plan, pairs, pairs + 1, pairs, pairs + 1);
+    SwapByTable(plan.size, plan.swapTable, pairs);
+    if (WideFirstPass<kLanes>(plan.order)) {
+        PairsInPlaceWithSpan<E, kInverse, kLanes, kWideSpan<kLanes>>(plan, pairs);
+    } else {
+        PairsInPlaceWithSpan<E, kInverse, kLanes, kNarrowSpan<kLanes>>(plan, pairs);
     }
-    SwapByTable(n, plan.swapTable, pairs);
-    StagesFrom<E, Form::kBlocked, Output::kPairsInPlace, kInverse>(
-        plan, pairs, pairs, nullptr, nullptr, [&](auto group, const E* w) {
-            constexpr std::size_t kGroup = decltype(group)::value;
-            FirstStagesInPlace<E, kInverse, kGroup>(n / kGroup, pairs, w);
-        });
 }
 
 // Interleaved pairs from a distinct source into dst, which is also the
 // work array: the same bits as copying first and transforming in place.
-template <class E, bool kInverse>
+template <class E, bool kInverse, std::size_t kLanes = kVectorLanes<E>>
 void PairsInto(const FFTPlan<E>& plan, const E* src, E* dst)
 {
-    TransformFrom<E, Form::kPairs, Form::kBlocked, Output::kPairsInPlace, kInverse>(plan, src, src + 1, dst, dst,
-                                                                                   nullptr, nullptr);
+    if (IsSmall(plan)) return SmallTransform<E, Form::kPairs, Form::kPairs, kInverse>(plan, src, src + 1, dst, dst + 1);
+    TransformFrom<E, Form::kPairs, Form::kBlocked, Output::kPairsInPlace, kInverse, kLanes>(plan, src, src + 1, dst,
+                                                                                           dst, nullptr, nullptr);
 }
 
 // Split arrays through a work array of 2 * size elements in the blocked
 // form; the last stages write the destination arrays. The work array keeps
 // the stages away from the caller's arrays, which often lie a multiple of
 // 4 KiB apart and would make loads wait on unrelated stores.
-template <class E, bool kInverse>
+template <class E, bool kInverse, std::size_t kLanes = kVectorLanes<E>>
 void SplitVia(const FFTPlan<E>& plan, const E* srcRe, const E* srcIm, E* work, E* re, E* im)
 {
-    TransformFrom<E, Form::kSplit, Form::kBlocked, Output::kSplitArrays, kInverse>(plan, srcRe, srcIm, work, work,
-                                                                                  re, im);
+    if (IsSmall(plan)) return SmallTransform<E, Form::kSplit, Form::kSplit, kInverse>(plan, srcRe, srcIm, re, im);
+    TransformFrom<E, Form::kSplit, Form::kBlocked, Output::kSplitArrays, kInverse, kLanes>(plan, srcRe, srcIm, work,
+                                                                                          work, re, im);
 }
 
 // The forward transform of pairs from a distinct source into split arrays,
 // which are also the work arrays (the real transform's half).
-template <class E>
+template <class E, std::size_t kLanes = kVectorLanes<E>>
 void PairsToSplitForward(const FFTPlan<E>& plan, const E* src, E* re, E* im)
 {
-    TransformFrom<E, Form::kPairs, Form::kSplit, Output::kInPlace, false>(plan, src, src + 1, re, im, nullptr, nullptr);
+    if (IsSmall(plan)) return SmallTransform<E, Form::kPairs, Form::kSplit, false>(plan, src, src + 1, re, im);
+    TransformFrom<E, Form::kPairs, Form::kSplit, Output::kInPlace, false, kLanes>(plan, src, src + 1, re, im, nullptr,
+                                                                                 nullptr);
 }
 
 template <class E>
@@ -382,6 +469,7 @@ void ComplexFFTInverse(const FFTPlan<E>& plan, E* pairs)
     PairsInPlace<E, true>(plan, pairs);
 }
 
+}  // namespace KESTACCEL_FFT_WIDTH_NAMESPACE
 }  // namespace cpp
 }  // namespace transform
 }  // namespace kestaccel

@@ -17,6 +17,7 @@
 namespace kestaccel {
 namespace transform {
 namespace cpp {
+inline namespace KESTACCEL_FFT_WIDTH_NAMESPACE {
 
 template <class State>
 void FreeState(State* state)
@@ -199,6 +200,7 @@ inline void FFTInv(const double* srcReal, const double* srcImag, double* dstReal
     ComplexDeinterleaved(srcReal, srcImag, dstReal, dstImag, state, true);
 }
 
+}  // namespace KESTACCEL_FFT_WIDTH_NAMESPACE
 }  // namespace cpp
 }  // namespace transform
 }  // namespace kestaccel

@@ -1,8 +1,8 @@
 #pragma once
 
-// The bit-reversal permutation, fused with the first two or three stages,
-// which need no table factors beyond four constants. The pass leaves the
-// points in a working form (split or blocked) for the stages that follow.
+// The bit-reversal permutation, fused with the first stages, which need no
+// more factors than the few of stages 3 and 4. The pass leaves the points
+// in a working form (split or blocked) for the stages that follow.
 
 #include <cstddef>
 #include <cstdint>
@@ -12,6 +12,7 @@
 namespace kestaccel {
 namespace transform {
 namespace cpp {
+inline namespace KESTACCEL_FFT_WIDTH_NAMESPACE {
 
 // The exchanges of the swap table on pairs, in place, walked upwards. An
 // entry equal to its index exchanges the point with itself, which changes
@@ -49,7 +50,7 @@ constexpr ReversedBytes MakeReversedBytes()
 inline constexpr ReversedBytes kReversedBytes = MakeReversedBytes();
 
 // The low `bits` bits of x in reverse order (bits up to 32).
-inline std::size_t ReverseBits(std::size_t x, unsigned int bits)
+[[gnu::always_inline]] inline std::size_t ReverseBits(std::size_t x, unsigned int bits)
 {
     const std::uint32_t v = static_cast<std::uint32_t>(x);
     const std::uint32_t r = (std::uint32_t(kReversedBytes.value[v & 0xffu]) << 24) |
@@ -59,141 +60,109 @@ inline std::size_t ReverseBits(std::size_t x, unsigned int bits)
     return bits == 0 ? 0 : r >> (32 - bits);
 }
 
-// Groups of 4 points take stages 1 and 2, groups of 8 stages 1 to 3 (with
-// the factors w), so that an even number of stages remains for the pairs.
-template <class E, std::size_t kGroup>
-inline void FirstStages(E* r, E* m, const E* w)
-{
-    if constexpr (kGroup == 4) {
-        StagesOneTwo(r, m);
-    } else {
-        StagesOneToThree(r, m, w);
-    }
-}
+constexpr unsigned int Log2(std::size_t n) { return n <= 1 ? 0 : 1 + Log2(n / 2); }
 
-// Point t of a group in bit-reversed order sits reverse(t) quarters or
-// eighths of the transform away from the group's first point.
-template <std::size_t kGroup>
+// t (below kCount, a power of two up to 256) with its log2(kCount) bits
+// reversed: point t of a group in bit-reversed order sits that many
+// kCount-ths of the transform away from the group's first point.
+template <std::size_t kCount>
 constexpr std::size_t ReversedPosition(std::size_t t)
 {
-    static_assert(kGroup == 4 || kGroup == 8, "groups of 4 or 8 points");
-    return kReversedBytes.value[t] >> (kGroup == 4 ? 6 : 5);
+    static_assert(kCount >= 2 && kCount <= 256 && (kCount & (kCount - 1)) == 0, "a power of two up to 256");
+    return kReversedBytes.value[t] >> (8 - Log2(kCount));
 }
 
 // Group g of the destination: points kGroup g onwards, in the destination's
-// form.
-template <class E, Form kDst, std::size_t kGroup>
+// form (in blocks of kLanes when blocked).
+template <class E, Form kDst, std::size_t kGroup, std::size_t kLanes>
 inline void StoreGroup(E* dstRe, E* dstIm, std::size_t g, const E* r, const E* m)
 {
-    using D = Points<E, kDst>;
-    constexpr std::size_t lanes = kDst == Form::kBlocked ? kLanes<E> : kGroup;
-    for (std::size_t t = 0; t < kGroup; ++t) {
-        D::Re(dstRe, dstIm, kGroup * g + t - t % lanes, t % lanes) = r[t];
-        D::Im(dstRe, dstIm, kGroup * g + t - t % lanes, t % lanes) = m[t];
-    }
-}
-
-constexpr std::size_t kRun = 4;
-
-// The groups of a run are held point by point: values[t * kRun + l] is
-// point t of the run's group l. Each part (real or imaginary) of kCount
-// points of every group goes to to + groupStride * groups[l] onwards. The
-// loop runs over the points with the run innermost, one part at a time, so
-// that g++ reads a point's kRun values as one group and transposes them
-// with shuffles (unrolled first, or with both parts in one loop, it stores
-// element by element).
-template <class E, std::size_t kCount>
-inline void ScatterRunPart(E* __restrict to, std::size_t groupStride, const std::size_t* groups,
-                           const E* __restrict values)
-{
-#if defined(__GNUC__)
-#pragma GCC unroll 1
-#endif
-    for (std::size_t t = 0; t < kCount; ++t)
-        for (std::size_t l = 0; l < kRun; ++l) to[groupStride * groups[l] + t] = values[t * kRun + l];
-}
-
-// The kRun groups of a run, each stored whole in the destination's form.
-template <class E, Form kDst, std::size_t kGroup>
-inline void StoreRunOfGroups(E* dstRe, E* dstIm, const std::size_t* groups, const E* re, const E* im)
-{
     if constexpr (kDst == Form::kBlocked) {
-        constexpr std::size_t lanes = kLanes<E>;
-        for (std::size_t b = 0; b < kGroup / lanes; ++b) {
-            ScatterRunPart<E, lanes>(dstRe + 2 * lanes * b, 2 * kGroup, groups, re + lanes * b * kRun);
-            ScatterRunPart<E, lanes>(dstRe + 2 * lanes * b + lanes, 2 * kGroup, groups, im + lanes * b * kRun);
+        for (std::size_t b = 0; b < kGroup; b += kLanes) {
+            E* const block = dstRe + 2 * (kGroup * g + b);
+            for (std::size_t u = 0; u < kLanes; ++u) block[u] = r[b + u];
+            for (std::size_t u = 0; u < kLanes; ++u) block[kLanes + u] = m[b + u];
         }
     } else {
-        ScatterRunPart<E, kGroup>(dstRe, kGroup, groups, re);
-        ScatterRunPart<E, kGroup>(dstIm, kGroup, groups, im);
+        using D = Points<E, kDst, kLanes>;
+        for (std::size_t t = 0; t < kGroup; ++t) {
+            D::Re(dstRe, dstIm, kGroup * g, t) = r[t];
+            D::Im(dstRe, dstIm, kGroup * g, t) = m[t];
+        }
     }
 }
 
-// The permuted copy from a distinct source, for a transform of kGroup
-// points (orders 2 and 3): its one group gathers the points at the
-// bit-reversed positions and takes the first stages. kConjugate negates
-// the imaginary parts on the way, as the inverse needs.
-template <class E, Form kSrc, Form kDst, bool kConjugate, std::size_t kGroup>
-[[gnu::noinline]] void GatherOneGroup(const E* __restrict srcRe, const E* __restrict srcIm, E* __restrict dstRe,
-                                      E* __restrict dstIm, const E* __restrict w)
+// values[t * kRun + l] to rows[l * kGroup + t]. g++ finds the fewer
+// shuffles with the shorter side innermost, and with the groups innermost
+// when the sides are equal.
+template <class E, std::size_t kGroup, std::size_t kRun>
+inline void TransposeRun(const E* __restrict values, E* __restrict rows)
 {
-    using S = Points<E, kSrc>;
-    E r[kGroup], m[kGroup];
-    for (std::size_t t = 0; t < kGroup; ++t) {
-        const std::size_t p = ReversedPosition<kGroup>(t);
-        r[t] = S::Re(srcRe, srcIm, p, 0);
-        m[t] = kConjugate ? -S::Im(srcRe, srcIm, p, 0) : S::Im(srcRe, srcIm, p, 0);
+    if constexpr (kRun < kGroup) {
+        for (std::size_t t = 0; t < kGroup; ++t)
+            for (std::size_t l = 0; l < kRun; ++l) rows[l * kGroup + t] = values[t * kRun + l];
+    } else {
+        for (std::size_t l = 0; l < kRun; ++l)
+            for (std::size_t t = 0; t < kGroup; ++t) rows[l * kGroup + t] = values[t * kRun + l];
     }
-    FirstStages<E, kGroup>(r, m, w);
-    StoreGroup<E, kDst, kGroup>(dstRe, dstIm, 0, r, m);
 }
 
-// The permuted copy from a distinct source with the first stages, for
-// transforms of at least four groups: group g of the destination holds the
-// points at the bit-reversed positions of kGroup g onwards, which lie at
-// reverse(g) plus reversed quarters (or eighths) of the transform. This
-// gives the same points as the swap-table exchanges followed by those
-// stages. Runs of kRun consecutive source positions are read together, so
-// the loads are contiguous and the first stages run on vectors across the
-// run; the kRun groups of a run lie spread through the destination
-// (bit-reversed run positions apart), each stored whole.
-template <class E, Form kSrc, Form kDst, bool kConjugate, std::size_t kGroup>
+// The groups of a run are held point by point: values[t * kRun + l] is
+// point t of the run's group l. The kRun groups are each stored whole in
+// the destination's form, group l as group groups[l]. The points are
+// transposed in locals first, one part at a time, a plain loop that g++
+// turns into shuffles. Kept out of line: inlined after the stages, or
+// stored group by group straight from values, g++ builds the groups from
+// single elements.
+template <class E, Form kDst, std::size_t kGroup, std::size_t kLanes, std::size_t kRun>
+[[gnu::noinline]] void StoreRunOfGroups(E* __restrict dstRe, E* __restrict dstIm, const std::size_t* groups,
+                                        const E* __restrict re, const E* __restrict im)
+{
+    E rowsRe[kRun * kGroup], rowsIm[kRun * kGroup];
+    TransposeRun<E, kGroup, kRun>(re, rowsRe);
+    TransposeRun<E, kGroup, kRun>(im, rowsIm);
+    for (std::size_t l = 0; l < kRun; ++l)
+        StoreGroup<E, kDst, kGroup, kLanes>(dstRe, dstIm, groups[l], rowsRe + l * kGroup, rowsIm + l * kGroup);
+}
+
+// The permuted copy from a distinct source with the first stages: group g
+// of the destination holds the points at the bit-reversed positions of
+// kGroup g onwards, which lie at reverse(g) plus reversed kGroup-ths of the
+// transform. This gives the same points as the swap-table exchanges
+// followed by those stages. kConjugate negates the imaginary parts on the
+// way, as the inverse needs.
+//
+// Runs of kRun consecutive source positions are read together, so the
+// loads are contiguous and the first stages run on vectors across the run;
+// the kRun groups of a run lie spread through the destination
+// (bit-reversed run positions apart), each stored whole: with 8 points or
+// more, a group covers a cache line, which is written once.
+template <class E, Form kSrc, Form kDst, bool kConjugate, std::size_t kGroup, std::size_t kSpan, std::size_t kLanes,
+          std::size_t kRun>
 [[gnu::noinline]] void GatherFirstStagesByRuns(std::uint32_t order, const E* __restrict srcRe,
                                                const E* __restrict srcIm, E* __restrict dstRe, E* __restrict dstIm,
                                                const E* __restrict w)
 {
-    using S = Points<E, kSrc>;
-    constexpr unsigned int groupBits = kGroup == 4 ? 2 : 3;
-    const unsigned int bits = order - groupBits;
-    const std::size_t quarter = std::size_t(1) << bits;  // n / kGroup
-    const std::size_t spread = quarter / kRun;
-    for (std::size_t r0 = 0; r0 < quarter; r0 += kRun) {
+    using S = Points<E, kSrc, kLanes>;
+    const unsigned int bits = order - Log2(kGroup);
+    const std::size_t groupCount = std::size_t(1) << bits;  // n / kGroup
+    const std::size_t spread = groupCount / kRun;
+    for (std::size_t r0 = 0; r0 < groupCount; r0 += kRun) {
         const std::size_t g0 = ReverseBits(r0, bits);
         E re[kGroup * kRun], im[kGroup * kRun];
-        // Unrolled whole, so that each point's position is a constant and
-        // its run is read as vectors (g++ leaves the loop of 8 rolled).
-#if defined(__GNUC__)
-#pragma GCC unroll 8
-#endif
-        for (std::size_t t = 0; t < kGroup; ++t) {
-            for (std::size_t l = 0; l < kRun; ++l) {
-                const std::size_t p = r0 + l + ReversedPosition<kGroup>(t) * quarter;
-                re[t * kRun + l] = S::Re(srcRe, srcIm, p, 0);
-                im[t * kRun + l] = kConjugate ? -S::Im(srcRe, srcIm, p, 0) : S::Im(srcRe, srcIm, p, 0);
-            }
-        }
-        // Kept a loop so that g++ vectorises it across the run rather than
-        // unrolling it first.
-#if defined(__GNUC__)
-#pragma GCC unroll 1
-#endif
+        // One loop over the run, vectorised across it, with the points of
+        // a group unrolled so that each one's position is a constant.
+        KESTACCEL_FFT_INDEPENDENT_LANES
         for (std::size_t l = 0; l < kRun; ++l) {
             E r[kGroup], m[kGroup];
+            KESTACCEL_FFT_UNROLL(16)
             for (std::size_t t = 0; t < kGroup; ++t) {
-                r[t] = re[t * kRun + l];
-                m[t] = im[t * kRun + l];
+                const std::size_t p = r0 + l + ReversedPosition<kGroup>(t) * groupCount;
+                r[t] = S::Re(srcRe, srcIm, p, 0);
+                m[t] = kConjugate ? -S::Im(srcRe, srcIm, p, 0) : S::Im(srcRe, srcIm, p, 0);
             }
-            FirstStages<E, kGroup>(r, m, w);
+            FirstStages<E, kGroup, kSpan>(r, m, w);
+            KESTACCEL_FFT_UNROLL(16)
             for (std::size_t t = 0; t < kGroup; ++t) {
                 re[t * kRun + l] = r[t];
                 im[t * kRun + l] = m[t];
@@ -201,25 +170,49 @@ template <class E, Form kSrc, Form kDst, bool kConjugate, std::size_t kGroup>
         }
         std::size_t groups[kRun];
         for (std::size_t l = 0; l < kRun; ++l) groups[l] = g0 + ReversedPosition<kRun>(l) * spread;
-        StoreRunOfGroups<E, kDst, kGroup>(dstRe, dstIm, groups, re, im);
+        StoreRunOfGroups<E, kDst, kGroup, kLanes, kRun>(dstRe, dstIm, groups, re, im);
     }
 }
 
-// The permuted copy with the first stages, by runs where there are at least
-// kRun groups.
-template <class E, Form kSrc, Form kDst, bool kConjugate, std::size_t kGroup>
+// The same, a group at a time, for transforms of fewer than kRun groups.
+template <class E, Form kSrc, Form kDst, bool kConjugate, std::size_t kGroup, std::size_t kSpan, std::size_t kLanes>
+[[gnu::noinline]] void GatherFirstStagesByGroups(std::uint32_t order, const E* __restrict srcRe,
+                                                 const E* __restrict srcIm, E* __restrict dstRe,
+                                                 E* __restrict dstIm, const E* __restrict w)
+{
+    using S = Points<E, kSrc, kLanes>;
+    const unsigned int bits = order - Log2(kGroup);
+    const std::size_t groupCount = std::size_t(1) << bits;
+    for (std::size_t g = 0; g < groupCount; ++g) {
+        const std::size_t first = ReverseBits(g, bits);
+        E r[kGroup], m[kGroup];
+        for (std::size_t t = 0; t < kGroup; ++t) {
+            const std::size_t p = first + ReversedPosition<kGroup>(t) * groupCount;
+            r[t] = S::Re(srcRe, srcIm, p, 0);
+            m[t] = kConjugate ? -S::Im(srcRe, srcIm, p, 0) : S::Im(srcRe, srcIm, p, 0);
+        }
+        FirstStages<E, kGroup, kSpan>(r, m, w);
+        StoreGroup<E, kDst, kGroup, kLanes>(dstRe, dstIm, g, r, m);
+    }
+}
+
+// The permuted copy with the first stages, by runs where there are at
+// least kRun groups.
+template <class E, Form kSrc, Form kDst, bool kConjugate, std::size_t kGroup, std::size_t kSpan, std::size_t kLanes,
+          std::size_t kRun>
 void FirstPass(std::uint32_t order, const E* srcRe, const E* srcIm, E* dstRe, E* dstIm, const E* w)
 {
-    if ((std::size_t(1) << order) == kGroup) {
-        GatherOneGroup<E, kSrc, kDst, kConjugate, kGroup>(srcRe, srcIm, dstRe, dstIm, w);
+    if ((std::size_t(1) << order) >= kGroup * kRun) {
+        GatherFirstStagesByRuns<E, kSrc, kDst, kConjugate, kGroup, kSpan, kLanes, kRun>(order, srcRe, srcIm, dstRe, dstIm,
+                                                                                 w);
     } else {
-        GatherFirstStagesByRuns<E, kSrc, kDst, kConjugate, kGroup>(order, srcRe, srcIm, dstRe, dstIm, w);
+        GatherFirstStagesByGroups<E, kSrc, kDst, kConjugate, kGroup, kSpan, kLanes>(order, srcRe, srcIm, dstRe, dstIm, w);
     }
 }
 
 // The same stages on pairs already exchanged in place, each group rewritten
 // in the blocked form over its own bytes.
-template <class E, bool kConjugate, std::size_t kGroup>
+template <class E, bool kConjugate, std::size_t kGroup, std::size_t kSpan, std::size_t kLanes>
 [[gnu::noinline]] void FirstStagesInPlace(std::size_t groups, E* __restrict data, const E* __restrict w)
 {
     for (std::size_t g = 0; g < groups; ++g) {
@@ -228,11 +221,12 @@ template <class E, bool kConjugate, std::size_t kGroup>
             r[t] = data[2 * (kGroup * g + t)];
             m[t] = kConjugate ? -data[2 * (kGroup * g + t) + 1] : data[2 * (kGroup * g + t) + 1];
         }
-        FirstStages<E, kGroup>(r, m, w);
-        StoreGroup<E, Form::kBlocked, kGroup>(data, data, g, r, m);
+        FirstStages<E, kGroup, kSpan>(r, m, w);
+        StoreGroup<E, Form::kBlocked, kGroup, kLanes>(data, data, g, r, m);
     }
 }
 
+}  // namespace KESTACCEL_FFT_WIDTH_NAMESPACE
 }  // namespace cpp
 }  // namespace transform
 }  // namespace kestaccel
